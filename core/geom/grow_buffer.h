@@ -1,0 +1,64 @@
+// A growing array of plain records that reports an exhausted heap instead of ending the program.
+#pragma once
+
+#include <cstdlib>
+#include <type_traits>
+
+#include "core/geom/types.h"
+
+// Elements are moved by realloc and never constructed or destroyed. Pointers into the buffer hold
+// until the next Reserve or Push.
+template <typename T> class GrowBuffer {
+    static_assert(std::is_trivially_copyable_v<T>);
+
+public:
+    GrowBuffer() = default;
+    ~GrowBuffer() { std::free(items); }
+    GrowBuffer(const GrowBuffer&) = delete;
+    GrowBuffer& operator=(const GrowBuffer&) = delete;
+
+    // Makes room for n elements in all. False, with nothing changed, when the heap is exhausted.
+    bool Reserve(size_t n)
+    {
+        if (n <= capacity)
+            return true;
+        if (n > kMaxItems)
+            return false;
+        size_t wanted = capacity < kMaxItems / 2 ? capacity * 2 : kMaxItems;
+        wanted = wanted < 8 ? 8 : wanted;
+        wanted = wanted < n ? n : wanted;
+        void* grown = std::realloc(static_cast<void*>(items), wanted * sizeof(T));
+        if (!grown)
+            return false;
+        items = static_cast<T*>(grown);
+        capacity = wanted;
+        return true;
+    }
+
+    // Appends a copy; false when the heap is exhausted.
+    bool Push(T item)
+    {
+        if (count == capacity && !Reserve(count + 1))
+            return false;
+        items[count++] = item;
+        return true;
+    }
+
+    // Drops all elements past the first n.
+    void Truncate(size_t n) { count = n < count ? n : count; }
+    // Drops all elements and keeps the memory.
+    void Clear() { count = 0; }
+
+    T* data() { return items; }
+    const T* data() const { return items; }
+    size_t size() const { return count; }
+    T& operator[](size_t i) { return items[i]; }
+    const T& operator[](size_t i) const { return items[i]; }
+
+private:
+    static constexpr size_t kMaxItems = (static_cast<size_t>(-1) / 2) / sizeof(T);
+
+    T* items = nullptr;
+    size_t count = 0;    // elements held
+    size_t capacity = 0; // elements there is room for
+};
