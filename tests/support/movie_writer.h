@@ -1,0 +1,79 @@
+#pragma once
+
+#include "tests/support/shape_writer.h"
+
+#include <optional>
+#include <string>
+
+// What a Place2 tag carries; only the parts that are set are written. The player takes the clip
+// depth from the first two bytes of the name when both are given; both are written all the same.
+struct PlaceOptions {
+    bool move = false;
+    std::optional<U16> character = {};
+    std::optional<Mat> matrix = {};
+    std::optional<Cx> cx = {};
+    std::optional<U16> ratio = {};
+    std::optional<std::string> name = {};
+    std::optional<U16> clipDepth = {};
+};
+
+// Grows a sequence of tags: a sprite's timeline, or (as MovieWriter) a whole movie's. Nothing is
+// checked, so that tests can write broken movies too.
+class TagWriter {
+public:
+    TagWriter& Raw(int code, const std::vector<U8>& body, bool forceLong = false);
+
+    // Codes 2 and 22 have no alpha in their colours, 32 has.
+    TagWriter& DefineShape(U16 id, int code, const Box& bounds, const ShapeBuilder& shape);
+    TagWriter& DefineShape(U16 id, const ShapeBuilder& shape, int code = 32);
+    TagWriter& DefineSprite(U16 id, U16 frameCount, const TagWriter& tags);
+    TagWriter& DefineSprite(U16 id, const TagWriter& tags); // counts the frames itself
+    TagWriter& FreeCharacter(U16 id);
+
+    TagWriter& Place(U16 id, U16 depth, const Mat& mat = {}); // code 4
+    TagWriter& Place(U16 id, U16 depth, const Mat& mat, const Cx& cx);
+    TagWriter& Place2(U16 depth, const PlaceOptions& options); // code 26
+    // The commonest Place2: a new place for what stands at the depth.
+    TagWriter& Move(U16 depth, const Mat& mat);
+    TagWriter& Move(U16 depth, const Mat& mat, const Cx& cx);
+    TagWriter& Remove(U16 id, U16 depth); // code 5
+    TagWriter& RemoveDepth(U16 depth);    // code 28
+
+    TagWriter& Background(Rgba color);
+    TagWriter& Label(const std::string& name);
+    TagWriter& DoAction(const std::vector<U8>& actions);
+    TagWriter& Show(int times = 1);
+    TagWriter& End();
+
+    int Frames() const { return frames; } // ShowFrame tags so far
+    const std::vector<U8>& Tags() const { return tags.Bytes(); }
+
+private:
+    ByteWriter tags;
+    int frames = 0;
+};
+
+// A frame rate in the header's 8.8 form.
+inline U16 Fps(double framesPerSecond)
+{
+    return U16(RoundSteadily(framesPerSecond * 256));
+}
+
+// A whole movie. The frame rectangle is in twips (20 a pixel); a frame count left out becomes the
+// number of frames written.
+class MovieWriter : public TagWriter {
+public:
+    explicit MovieWriter(S32 width = 640 * 20, S32 height = 480 * 20, U16 rate = 12 << 8,
+                         std::optional<U16> frameCount = {});
+    MovieWriter(const Box& frame, U16 rate, std::optional<U16> frameCount = {});
+
+    // The header, with the file's true length, and the tags so far.
+    std::vector<U8> Bytes() const;
+
+    U8 version = 5;
+
+private:
+    Box frameBox;
+    U16 frameRate;
+    std::optional<U16> count;
+};
