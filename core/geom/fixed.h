@@ -56,6 +56,6 @@ inline S32 FixedNearestMultiple(S32 v, S32 m)
     return static_cast<S32>((v >= 0 ? v + half : v - half) / m * m);
 }
 
-// x * num / den to the nearest integer, saturated to 32 bits; 0 when den is 0. |x| is below 2^33,
+// x * num / den to the nearest integer, saturated to 32 bits; 0 when den is 0. |x| is at most 2^32,
 // |num| and |den| below 2^62; the ratio is used with 29 significant bits or more.
 S32 ScaleByRatio(S64 x, S64 num, S64 den);

@@ -27,7 +27,7 @@ void PointShift(const SPOINT* p, int n, SPOINT* dst);
 void PointScale(const SPOINT* p, S32 s, SPOINT* dst);
 
 // Length of a vector whose extents are given as magnitudes: the longer one times an interpolated
-// table of sqrt(1 + r*r), at most 0.004% short. Lengths beyond 32 bits give the greatest value.
+// table of sqrt(1 + r*r), good to 0.005%. Lengths beyond 32 bits give the greatest value.
 S32 VectorLength(U32 dx, U32 dy);
 
 // VectorLength of the vector p, and of the vector between two points.
