@@ -1,0 +1,173 @@
+// DisplayList: the scene of one player: the object tree, the camera, the background and the dirty
+// rectangles that the raster repaints.
+#pragma once
+
+#include "core/display/place_info.h"
+#include "core/display/sobject.h"
+#include "core/geom/chunk_alloc.h"
+#include "core/geom/rect.h"
+#include "core/raster/bit_buffer.h"
+#include "core/raster/raster.h"
+
+class CSoundMix;
+class ScriptThread;
+
+// Low four bits and alignment bits of a scale mode.
+enum SScaleMode : S32 {
+    kScaleShowAll = 0, // the whole movie, bars at the sides
+    kScaleFill = 1,    // the whole area, movie cropped
+    kScaleStretch = 2, // both; also every value up to 15 not named here
+    kScaleFixed = 3,   // one pixel per 20 twips
+    kScaleMask = 0x0F,
+    kAlignLeft = 0x10,
+    kAlignRight = 0x20,
+    kAlignTop = 0x40,
+    kAlignBottom = 0x80,
+};
+
+// Where a tracked button stood before a seek, so that its rebuilt self goes on.
+struct SButtonIdentity {
+    SObject* parent;
+    U32 parentSerial;
+    SCharacter* character;
+    U16 depth;
+    U16 ratio;
+};
+
+// Rewrites two overlapping rectangles as two that cover the same union without overlapping.
+void DecomposeRect(SRECT* a, SRECT* b);
+// The interiors overlap: touching sides do not count.
+bool RectTestOverlap(const SRECT* a, const SRECT* b);
+S32 RectArea(const SRECT* r);
+
+// Exactly one per player. Everything runs on the player's thread, one call at a time. Device
+// coordinates are pixels, or quarter pixels while `antialias` is on.
+class DisplayList {
+public:
+    static constexpr int kMaxDirty = 4;
+    // Objects above this depth were made by scripts and survive a seek.
+    static constexpr U16 kMaxTimelineDepth = 16383;
+
+    MATRIX camera;               // twips to device; set only by SetCamera
+    ColorTransform cameraCxform; // of the whole scene; stays the identity
+    SObject root;                // not from the pool
+    SRGB backgroundColor;        // painted under everything; all four bytes 0: nothing is
+    int backgroundPriority = 0;  // of the last accepted background colour
+    CBitBuffer* bits = nullptr;  // drawn into, not owned
+    int antialias = 0;
+    int animatedMovie = 0;  // more than one frame and not best quality: plainer smoothing
+    int smoothing = 0;      // bitmaps are smoothed
+    int supersampling = 1;  // 2 when anti-aliased
+    int needCalcUpdate = 0; // some object was modified
+    SRECT devViewRect;      // the whole device area
+    SRECT bitsDirty;        // pixels painted since the player last took it
+    SRECT devDirtyRgn;      // union of what is pending
+    int nDirty = 0;
+    S32 dirtyArea[kMaxDirty];
+    SRECT dirtyList[kMaxDirty];
+    CRaster raster;
+    SObject* holdList = nullptr;     // during a hold: the held parent's previous children
+    SObject* holdParent = nullptr;   // during a hold: whose children are being rebuilt
+    ScriptThread* threads = nullptr; // every live timeline, newest first
+    ScriptThread* threadCursor =
+        nullptr;               // next thread of the tick's walk; kept valid by RemoveThread
+    SObject* button = nullptr; // the button that the pointer tracks
+    int buttonState = 0;
+    SRECT tabFocusRect;   // of the keyboard focus highlight; empty when none
+    int useFocusRect = 1; // the highlight is drawn
+    SButtonIdentity buttonIdentity = {};
+    S32 instanceCount = 0;         // unnamed sprites placed so far
+    CSoundMix* soundMix = nullptr; // takes the sounds of buttons
+    int editTextFlag = 0;          // some text field draws with a device font
+    U32 tagsLeft = 0;              // tags that may still run in this tick; see ResetBudget
+
+    ChunkAlloc edgeAlloc;
+    ChunkAlloc objectAlloc;
+    ChunkAlloc colorAlloc;
+
+    DisplayList();
+    ~DisplayList();
+    DisplayList(const DisplayList&) = delete;
+    DisplayList& operator=(const DisplayList&) = delete;
+
+    // Places a new object under `parent`. A sprite gets its timeline and shows its first frame at
+    // once. Null, and nothing placed, when a limit or memory forbids it, or when the character
+    // already stands among the parents.
+    SObject* PlaceObject(SObject* parent, const PlaceInfo* info);
+    // Changes the object at the depth as the flags say; null when there is none or a script has it.
+    SObject* MoveObject(SObject* parent, const PlaceInfo* info);
+    void RemoveObject(SObject* parent, U16 depth);
+    // Removes the object that *link points at.
+    void DoRemove(SObject** link);
+    // Removes that very object, wherever it is; null is allowed.
+    void RemoveThisObject(SObject* obj);
+    // The child at a depth, or null.
+    SObject* FindChild(SObject* parent, U16 depth) const;
+
+    // Bracket around a timeline's rebuild from its first frame: objects that exist before and after
+    // stay, with their own timelines and state. A hold that is still open is finished first.
+    void BeginHold(SObject* parent);
+    void FinishHold();
+
+    // Marks device area `r`, grown by two pixels, as to be repainted.
+    void InvalidateRect(const SRECT* r);
+    // One merge of the cheapest pair of dirty rectangles, if it pays or is forced. True when
+    // merged.
+    bool MergeDirtyList(bool forced);
+    // Merges what pays and makes the rest disjoint.
+    void DecomposeDirtyList();
+    // Shows `frame` (twips) in `client` (pixels); true when the camera changed.
+    bool SetCamera(const SRECT* frame, const SRECT* client, int antialias, S32 scaleMode);
+    // Everything is to be recalculated and repainted.
+    void ModifyCamera();
+    void UpdateDevViewRect();
+    void SetBits(CBitBuffer* buffer);
+    // Accepted when `priority` is above the current one.
+    void SetBackgroundColor(SRGB color, int priority);
+    // Forgets a background colour of a priority below 2.
+    void Reset();
+    // Recalculates what was modified.
+    void CalcUpdate();
+    // Repaints all dirty areas; the dirt is gone afterwards even when there is nothing to paint
+    // into.
+    void Update();
+    // Paints one rectangle of pixels, half-open.
+    void UpdateRect(const SRECT* r);
+    // Device rectangle to pixels, each bound divided toward zero.
+    void CalcBitsDirty(const SRECT* dev, SRECT* pix) const;
+
+    void AddThread(ScriptThread* thread);
+    void RemoveThread(ScriptThread* thread);
+    // Drops all cached edges and colours, and empty pool blocks.
+    void FreeCache();
+
+    // The topmost object of any kind under `pt` (device units), or null.
+    SObject* HitTest(const SPOINT* pt);
+
+    // Allows the next tick its full number of tags.
+    void ResetBudget();
+
+    // Pool records, zeroed; null when a limit or memory forbids it.
+    REdge* NewEdge() { return static_cast<REdge*>(edgeAlloc.Alloc()); }
+    RColor* NewColor() { return static_cast<RColor*>(colorAlloc.Alloc()); }
+
+private:
+    friend struct SObject;
+
+    bool MayPlace(const SObject* parent, const SCharacter* character) const;
+    SObject** InsertionLink(SObject* parent, U16 depth);
+    void NameObject(SObject* obj, const PlaceInfo* info);
+    void StartTimeline(SObject* obj, const PlaceInfo* info);
+    void StartSprite(SObject* obj);
+    void StartLoadedMovie(SObject* obj, const PlaceInfo* info);
+    void AttachTimeline(SObject* obj, ScriptThread* thread);
+    bool KeepsOld(const SObject* old, const SObject* fresh) const;
+    void TakeTransform(SObject* old, const SObject* fresh);
+    SObject** MergeHeld(SObject** link, SObject* old);
+    void DropHeld();
+    void MakeDisjoint();
+    void PaintBackground(RColor* color, REdge edges[2]);
+    void PaintFocus(RColor* color, REdge** edges);
+
+    U32 nextSerial = 1;
+};

@@ -1,0 +1,99 @@
+// SObject: one instance of a character on the display list, and the walks over the object tree.
+#pragma once
+
+#include "core/geom/matrix.h"
+#include "core/geom/rect.h"
+#include "core/raster/color.h"
+
+class CRaster;
+class DisplayList;
+class ScriptThread;
+struct EditText;
+struct RColor;
+struct REdge;
+struct SCharacter;
+
+// Placement of an object relative to its parent, or of a whole chain of parents.
+struct STransform {
+    MATRIX mat;
+    ColorTransform cxform;
+
+    // Becomes the transform that applies `inner` first and then what this was.
+    void Concat(const STransform* inner);
+};
+
+// Objects come zeroed from the display list's pool and go back to it; they are placed, moved and
+// removed through the DisplayList only. Siblings are linked from the lowest depth up.
+struct SObject {
+    DisplayList* display;  // the list that owns the object
+    SObject* parent;       // null for the root
+    SObject* above;        // next higher sibling
+    SObject* bottomChild;  // lowest child
+    SCharacter* character; // what is shown; null only for the root. Counted as a user of the record
+    U16 depth;             // ordering key among siblings
+    U16 ratio;             // morph ratio
+    char* name;            // instance name, owned; null when there is none
+    ScriptThread* thread;  // a sprite's or movie's own timeline, else that of the parent
+    STransform xform;      // relative to the parent
+    SRECT devBounds;       // device units, valid after CalcUpdate
+    U8 puppet;             // scripts have taken over: timelines no longer move it
+    U8 state;              // button state
+    U8 drawn;              // its edges went to the raster since the last recalculation
+    U8 dirty;              // to be recalculated, with all below it
+    U8 visible;            // 0 hides it and all below it, also from hit tests
+    U16 clipDepth;         // non-zero: masks the following siblings up to this depth
+    S32 reservedWord;      // cleared
+    SRECT reservedRect;    // emptied
+    char* dropTarget;      // owned; path of the object that it was last dropped over
+    REdge* edges;          // cached, device units
+    RColor* colors;        // of those edges
+    EditText* editText;    // of a text field, owned
+    U32 serial;            // never the same for two objects of one list: tells a recycled record
+    U16 nesting;           // number of parents
+
+    // To be called before every change of matrix, colour transform, character or ratio.
+    void Modify();
+    // Recalculates device bounds of what changed, here and below, and invalidates old and new
+    // places.
+    void CalcUpdate(const MATRIX* parentMat, bool forced);
+    // devBounds of the character through `mat`; empty without a character.
+    void CalcDevBounds(const MATRIX* mat);
+
+    // Hands the edges of this object and all below it to the raster. `xform` is the parent's.
+    void Draw(CRaster* raster, STransform xform, RColor* clip);
+    // Draws the mask that this object is, and what it masks; returns the first sibling after that.
+    SObject* DrawClipBracket(CRaster* raster, const STransform* parentXform, RColor* clip);
+    // Builds edges and colours under `xform` (this object's own included) unless they are cached.
+    void BuildEdges(const STransform* xform);
+
+    // `pt` (device units) lies on this object's own shape. `xform` includes this object's.
+    bool HitTestOne(const STransform* xform, const SPOINT* pt);
+    // Sets `hit` to the topmost object of this subtree under `pt`; leaves it alone when there is
+    // none.
+    void HitTest(SObject*& hit, STransform xform, const SPOINT* pt);
+    // For a mask: the next sibling when `pt` is inside it, else the first sibling beyond its range.
+    SObject* HitClipper(const STransform* parentXform, const SPOINT* pt);
+
+    // Gives the cached edges and colours back to the pools.
+    void FreeCache();
+    // The same for this object and all below it.
+    void FreeCacheTree();
+    // Removes all children.
+    void FreeChildren();
+    // Releases all that the object owns, the record itself excepted.
+    void Free();
+
+    // The object has a timeline of its own.
+    bool OwnsThread() const;
+    // This object is a mask for its siblings.
+    bool IsClip() const { return clipDepth != 0; }
+
+private:
+    bool EdgesContain(const SPOINT* pt);
+    SObject* FirstBeyond(U16 maskDepth) const;
+};
+
+// Union of the character's bounds and those of all children, in the coordinates of the object's
+// parent, or through `mat` as well. Morphs count with their start bounds.
+void GetBoundingBox(SObject* obj, SRECT* r);
+void GetBoundingBox(SObject* obj, const MATRIX* mat, SRECT* r);

@@ -1,0 +1,3 @@
+#include "core/player/limits.h"
+
+SLimits gLimits;

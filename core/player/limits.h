@@ -1,0 +1,37 @@
+// Every limit that keeps a hostile movie from taking the machine, with its reason and what is seen
+// when it strikes. A shell may lower them before it opens a movie. This header stands alone, so
+// that the lower areas can read the table too.
+#pragma once
+
+#include "core/geom/types.h"
+
+struct SLimits {
+    // Declared movie length. A longer one is an out-of-memory error of the loader: nothing plays.
+    U32 movieBytes = 256u << 20;
+    // Pixels of one bitmap and of a drawing surface. A larger one is not created.
+    U32 surfacePixels = 64u << 20;
+    // Display objects inside one another. A deeper one is not placed.
+    S32 nesting = 128;
+    // Display objects alive in one display list. Further ones are not placed.
+    U32 liveObjects = 65536;
+    // Edges alive in one display list: all that is cached for drawing. Further ones are dropped.
+    U32 liveEdges = 4u << 20;
+    // Fill and line colours alive in one display list. A shape that needs more is not drawn.
+    U32 liveColors = 1u << 20;
+    // Characters of one movie. Further definitions are ignored.
+    U32 characters = 65536;
+    // Bytes of one script string; a longer one is cut.
+    U32 stringBytes = 1u << 20;
+    // Variables of one timeline. Further names are dropped.
+    U32 variables = 16384;
+    // Bytes of a stream of variables; the rest is dropped.
+    U32 variablesBytes = 4u << 20;
+    // Tags executed by one call that brings a timeline to a frame, nested placements included; then
+    // the call returns as if the data ended there.
+    U32 tagsPerDraw = 4u << 20;
+    // Levels and movies loaded beside the root.
+    U32 loadedMovies = 256;
+};
+
+// The table in force.
+extern SLimits gLimits;

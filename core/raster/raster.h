@@ -1,0 +1,179 @@
+// CRaster: edges in, pixels out, one scanline at a time.
+//
+// A paint is: Attach (buffer and area), BeginPaint, AddEdges for each object from the lowest up,
+// PaintBits, Flush. Edges and colours stay their owners' and must live until PaintBits returns.
+// With anti-aliasing all edge coordinates are quarter pixels; the area is in pixels always. One
+// thread at a time; no operation fails loudly: what cannot be allocated is not painted.
+#pragma once
+
+#include "core/geom/chunk_alloc.h"
+#include "core/geom/grow_buffer.h"
+#include "core/geom/rect.h"
+#include "core/raster/bit_buffer.h"
+#include "core/raster/edge.h"
+#include "core/raster/rcolor.h"
+
+struct RActiveEdge;
+
+// A piece of one sub-scanline: everything from where the last piece ended up to xmax shows one
+// stack.
+struct RSpan {
+    S32 xmax;  // exclusive, quarter pixels
+    U32 stack; // index of an RStack of the row; 0: nothing
+};
+
+// The colours that count in a span, top first; shared by all spans of a pixel row that show the
+// same.
+struct RStack {
+    U32 first; // index of the first of `count` entries of the row's colour store
+    U32 count;
+    U32 next;    // older stack with the same top colour in this row, 0 when none
+    Lanes solid; // the blended colour, when isSolid
+    bool isSolid;
+};
+
+// One horizontal run of a pixel row: where its four sub-scanlines show the same four stacks.
+struct RRun {
+    S32 xmin; // quarter pixels, half-open
+    S32 xmax;
+    U32 stacks[4];
+    bool same;    // all four are one stack
+    bool isSolid; // every stack is solid, so that the run has one colour
+    Lanes sum;    // the sum over the four stacks, when isSolid
+};
+
+class CRaster {
+public:
+    // Anti-aliased coordinates of a larger area would leave the 16 bits of an edge.
+    static constexpr S32 kMaxAntialiasSide = 8000;
+
+    CRaster();
+    ~CRaster();
+    CRaster(const CRaster&) = delete;
+    CRaster& operator=(const CRaster&) = delete;
+
+    // Binds the output and the pixels to paint: `r` half-open (xmax, ymax exclusive) and clipped to
+    // the buffer. `antialias` says in which units the edges come.
+    void Attach(CBitBuffer* output, const SRECT* r, int antialias);
+    // Pixels that shine through where nothing opaque is painted; null (the start): white.
+    void SetBackgroundBits(CBitBuffer* background);
+    // The output keeps alpha for this paint: it begins cleared, and what is not covered stays
+    // transparent.
+    void UseAlphaChannel();
+    // The attached output has pixels.
+    bool BitsValid() const;
+
+    // The area being painted, device units (quarter pixels when anti-aliased), half-open.
+    const SRECT* AreaDev() const { return &areaDev; }
+    int Antialias() const { return antialias; }
+    CBitBuffer* Output() const { return output; }
+    S32 CurrentRow() const { return rowY; }
+
+    void BeginPaint();
+    // Adds an object above all that was added before. Colours get their layer and `clip` as their
+    // clip colour; ClipMarker() marks an outermost mask.
+    void AddEdges(REdge* edges, RColor* colors, RColor* clip);
+    // The edges alone: colours and layer stay as they are.
+    void AddEdges(REdge* edges);
+    void PaintBits();
+    void Flush();
+
+    // Makes pixel row y the current one.
+    void SetYCoord(S32 y);
+
+    // Returns empty blocks of the pools to the system.
+    void FreeEmpties();
+
+    // Memory for one built ramp (kRampEntries words); null when exhausted.
+    U32* AllocRamp();
+    void FreeRamp(U32* ramp);
+
+    // --- for the paint procedures of the colours ---
+    U8* RowBits() const { return rowBits; }
+    const CPixelOps* Ops() const { return ops; }
+
+private:
+    static constexpr S32 kPiece = 256;        // pixels that a span buffer holds
+    static constexpr int kMaxCollected = 255; // colours that one span can blend
+    static constexpr U64 kMaxWork =
+        1ull << 28; // edge and stack steps of one paint; then rows stay unpainted
+
+    void AddBucketEdges(REdge* edges);
+    void SetLayer(RColor* colors, RColor* clip);
+
+    // active.cpp: edges entering, moving and leaving
+    void AddActive();
+    bool SetUpActive(const REdge* edge);
+    void SortActive();
+    void FreeActive();
+
+    // crossing.cpp: the colour stack
+    void PaintActive();
+    void CrossEdge(const RActiveEdge* edge);
+    void ToggleColor(RColor* c, S32 x);
+    void CountColor(RColor* c, S32 x, int dir);
+    void ClearStack();
+    int Collect();
+    void PaintSlab(S32 x);
+
+    // slab.cpp: spans without anti-aliasing
+    void DrawCollected(S32 x0, S32 x1, RColor* const* colors, int count);
+    void CompositeSlab(S32 x0, S32 x1, RColor* const* colors, int count);
+    void ReadBackground(S32 x, S32 n, RGBI* dst) const;
+    Lanes BackgroundPixel(S32 x) const;
+
+    // aa_runs.cpp: spans with anti-aliasing
+    void BeginSubline();
+    void EndSubline();
+    void RecordSpan(S32 xmax);
+    U32 InternStack(int count);
+    U32 NewStack(int count);
+    void PaintAARuns();
+    void MakeRun(RRun* run) const;
+    void PaintRun(const RRun& run);
+    Lanes CalcColor(const RRun& run, S32 x);
+    Lanes StackColor(const RStack& stack, S32 x);
+    void AddCoverage(S32 x, Lanes value);
+    void EmitCoverage();
+    void EmitPixel(S32 x, Lanes value);
+    void FlushPixels();
+    void PaintInterior(const RRun& run, S32 x0, S32 x1);
+    void PaintStackInterior(const RStack& stack, S32 x0, S32 x1);
+
+    CBitBuffer* output = nullptr;
+    CBitBuffer* backgroundBits = nullptr;
+    const CPixelOps* ops;
+    U8* rowBits = nullptr;
+    S32 rowY = 0; // current pixel row
+    int antialias = 0;
+    bool alphaOutput = false;
+    SRECT area = {};    // painted pixels, half-open
+    SRECT areaDev = {}; // the same in device units
+
+    U32 layer = 0;
+    U64 work = 0;
+    S32 y = 0;      // current scanline, device units
+    S32 paintX = 0; // where the next span begins
+    RColor* stackTop = nullptr;
+    RColor* collected[kMaxCollected];
+
+    GrowBuffer<REdge*> buckets;      // a list head per scanline of areaDev
+    GrowBuffer<RActiveEdge*> active; // sorted by x once SortActive has run
+    ChunkAlloc activeAlloc;
+    ChunkAlloc rampAlloc;
+    bool needsSort = false;
+
+    U32 rowSerial = 0; // of the pixel row whose spans are being recorded
+    GrowBuffer<RSpan> sublines[4];
+    GrowBuffer<RStack> stacks; // entry 0 is the empty stack
+    GrowBuffer<RColor*> stackColors;
+    bool rowLost = false; // memory ran out: the row stays unpainted
+    S32 coverX = 0;       // pixel being accumulated ...
+    Lanes cover = 0;      // ... and its sum
+    bool covering = false;
+    S32 pendingX = 0; // finished pixels that wait to be written side by side
+    S32 pendingCount = 0;
+    bool pendingOpaque = true;
+    RGBI pending[kPiece];
+    RGBI piece[kPiece];
+};

@@ -1,0 +1,107 @@
+// SShapeParser: shape records into raster colours and device-space curves, one record at a time.
+#pragma once
+
+#include "core/geom/curve.h"
+#include "core/geom/matrix.h"
+#include "core/raster/raster.h"
+#include "core/stream/parser.h"
+
+class DisplayList;
+class ScriptPlayer;
+
+struct SLineStyle {
+    RColor* color; // null: not stroked
+    S32 thickness; // device units
+};
+
+// Reads the style block and the edge records of a shape, a morph shape's start list or a glyph. The
+// caller asks for the styles once and then for records until the end, and looks colours up in
+// `fillIndex` and `lineIndex` by the current selectors with Fill and LineStyle, which answer none
+// for a selector beyond the table. Colours belong to `colorList`, not to the parser.
+class SShapeParser : public SParser {
+public:
+    static constexpr int kEndOfShape = 0x80;
+    enum RecordFlags : int {
+        kMoveTo = 0x01,
+        kFill0 = 0x02,
+        kFill1 = 0x04,
+        kLineStyle = 0x08,
+        kNewStyles = 0x10,
+    };
+
+    ScriptPlayer* player;      // resolves bitmap ids; may be null
+    CRaster* raster = nullptr; // the raster that colours are built for; null leaves them unbuilt
+    DisplayList* display;      // owner of the colour pool
+    RColor** colorList;        // every colour made is pushed on the front of this list
+    MATRIX mat;                // shape to device
+    ColorTransform cxform;     // of the instance; identity at first
+    U16 ratio = 0;             // morph ratio, 0 = start shape
+    U32 layer = 0;             // style numbers of the current block start after this
+    U32 nLines = 0;
+    U32 nFills = 0;
+    RColor** fillIndex;    // nFills + 1 entries, the first null
+    SLineStyle* lineIndex; // nLines + 1 entries, the first empty
+    S32 nFillBits = 0;
+    S32 nLineBits = 0;
+    U32 line = 0; // current selectors
+    U32 fill0 = 0;
+    U32 fill1 = 0;
+    bool getAlpha = false; // colours carry an alpha byte
+    SPOINT curPt = {0, 0}; // pen, shape coordinates
+    SPOINT curPtX;         // pen, device coordinates
+
+    // Reads `dataLen` bytes at `data` from `start`. `list` is the head that colours are pushed on.
+    SShapeParser(ScriptPlayer* player, DisplayList* display, RColor** list, const U8* data,
+                 S32 dataLen, S32 start, const MATRIX* mat);
+    ~SShapeParser();
+    SShapeParser(const SShapeParser&) = delete;
+    SShapeParser& operator=(const SShapeParser&) = delete;
+
+    // Reads a style block, replacing the tables. False when memory or the data ran out: the shape
+    // is given up.
+    bool GetStyles();
+    // The same for a morph style block, each pair interpolated at `ratio`.
+    bool GetMorphStyles();
+    // Reads the two selector widths alone: for glyphs, whose colours the caller has set.
+    void GetSelectorWidths();
+    // Reads one record: 0 for an edge, which fills `c`; kEndOfShape at the end; else the flags of a
+    // style change, already applied.
+    int GetEdge(CURVE* c);
+
+    // The colour of a fill selector; null for 0 and for a selector beyond the table.
+    RColor* Fill(U32 selector) const { return selector <= nFills ? fillIndex[selector] : nullptr; }
+    SLineStyle LineStyle(U32 selector) const;
+    // Makes a glyph's colour the only fill.
+    void SetOnlyFill(RColor* color);
+
+    // Finishes a colour whose kind and parameters are filled in: its inverse matrices and its
+    // cache.
+    void SetupColor(RColor* color);
+
+private:
+    static constexpr U32 kInlineStyles = 256;
+
+    bool ReadStyleBlock(bool morph);
+    bool ReadFills(bool morph);
+    bool ReadLines(bool morph);
+    U32 ReadCount(bool* escaped);
+    bool SizeFills(U32 count);
+    bool SizeLines(U32 count);
+    RColor* NewColor(U32 number);
+    void ReadFill(RColor* color, bool morph);
+    void ReadGradient(RColor* color, U8 type, bool morph);
+    void ReadRamp(RColor* color, bool morph);
+    void ReadBitmapFill(RColor* color, U8 type, bool morph);
+    void ReadSolid(RColor* color, bool morph);
+    void ReadFillMatrix(MATRIX* m, bool morph);
+    void FinishSolid(RColor* color);
+    void ReadStraight(CURVE* c);
+    void ReadCurved(CURVE* c);
+    int ReadStyleChange(int flags);
+
+    bool morphStyles = false; // new styles inside the records are morph style blocks
+    RColor* inlineFills[kInlineStyles];
+    SLineStyle inlineLines[kInlineStyles];
+    RColor** heapFills = nullptr;
+    SLineStyle* heapLines = nullptr;
+};

@@ -1,0 +1,103 @@
+// ScriptPlayer: one loaded movie: its bytes as they arrive, its header, its character dictionary,
+// and its root timeline.
+#pragma once
+
+#include "core/geom/chunk_alloc.h"
+#include "core/geom/rect.h"
+#include "core/stream/character.h"
+#include "core/stream/script_thread.h"
+
+struct StreamData;
+
+// Errors kept in scriptErr; final until ClearScript.
+enum SScriptError : S32 { kErrNone = 0, kErrBadHeader = -1, kErrNoMemory = -2 };
+
+// The movie buffer is allocated once at the declared length, zeroed, with one zero byte more, and
+// never moves: names, labels and character bodies point into it. Blocks of any size are pushed as
+// they arrive; the result does not depend on how they were cut. Player thread only.
+class ScriptPlayer : public ScriptThread {
+public:
+    // numFramesComplete of a movie that is all there.
+    static constexpr S32 kAllFrames = 16000;
+    static constexpr int kChains = 128;
+
+    ScriptPlayer* nextLayer = nullptr; // link of the player's levels
+    char* sourceName = nullptr;        // owned; where the movie came from
+    S32 scriptLen = -1;                // declared length; -1 while the header has not arrived
+    S32* sharedScript = nullptr; // holders of the buffer, when it is shared with other loaders
+    S32 headerBytes = 0;         // of the first 8 bytes, how many have arrived
+    U8 header[8] = {};
+    bool gotHeader = false;     // frame rectangle, rate and count are known
+    S32 numFramesComplete = -1; // index of the last frame that is all there; kAllFrames at the end
+    S32 scanPos = 0;            // first tag not yet counted
+    SRECT frame = {0, 1440, 0, 1440}; // twips
+    S32 frameRate = 0;                // frames a second, 16.16
+    S32 frameDelay = 0;               // milliseconds
+    U32 version = 0;
+    void* jpegInfo = nullptr;     // the shared JPEG decoder, when one has been set up
+    StreamData* stream = nullptr; // the stream that feeds this movie
+    bool varsMode = false;        // the stream carries variables, not a movie
+    S32 varsLayer = -1;           // level that receives them
+    char* varsTarget = nullptr;   // owned; path that receives them
+    bool sharedCopy = false;      // a clone that plays another loader's buffer
+
+    ScriptPlayer();
+    ~ScriptPlayer() override;
+
+    // Appends a block. After an error, and beyond the declared length, bytes are ignored.
+    void PushDataBuf(const U8* data, S32 n);
+    // For the player's own movie, after each block: shows the first frame once it is there.
+    void PushDataComplete();
+    // The stream has ended.
+    void SetDataComplete();
+
+    // Drops the movie and all that came of it; ready for another.
+    void ClearScript();
+    // Drops the dictionary and rewinds; the bytes stay, so that the movie can run again.
+    void FreeAll();
+    // Drops decoded pixels that nobody uses, and empty pool blocks.
+    void FreeCache();
+
+    // A zeroed entry of type kCharNone, or null when the id is taken or memory is exhausted.
+    SCharacter* CreateCharacter(U16 id);
+    SCharacter* FindCharacter(U16 id);
+    void FreeCharacter(U16 id);
+    // Frees an entry that is out of the dictionary already, now or with its last user.
+    void FreeCharacter(SCharacter* ch);
+    // A zeroed record that belongs to one object and is in no dictionary.
+    SCharacter* NewPrivateCharacter();
+
+    // All bytes are there.
+    bool Complete() const { return scriptLen >= 0 && len >= scriptLen; }
+    // Every tag of that frame is there.
+    bool FrameAvailable(S32 n) const
+    {
+        return numFramesComplete == kAllFrames || n <= numFramesComplete;
+    }
+    // First byte after the movie's readable memory, as an index into `script`.
+    S32 DataLimit() const { return scriptLen < 0 ? 0 : scriptLen; }
+    // Bytes of `p`, a pointer into the buffer, up to its end; 0 for a foreign pointer.
+    S32 BytesFrom(const U8* p) const;
+    // Frames whose ShowFrame is there, counted by walking the tags.
+    S32 CountFrames() const;
+
+    SCharacter* charIndex[kChains] = {};
+    ChunkAlloc charAlloc;
+
+private:
+    bool CollectHeader(const U8*& data, S32& n);
+    void ParseHeader();
+    void CountCompleteFrames();
+    void ReleaseBuffer();
+    void PushVariables(const U8* data, S32 n);
+    void DestroyCharacter(SCharacter* ch);
+
+    U8* varsData = nullptr; // bytes of a variables stream
+    size_t varsLen = 0;
+    size_t varsCapacity = 0;
+};
+
+// A user of a character's record: a pointer that must stay valid.
+void RetainCharacter(SCharacter* ch);
+// Lets go of it; an orphan's last release frees it. Null is allowed.
+void ReleaseCharacter(SCharacter* ch);

@@ -1,0 +1,132 @@
+// ScriptThread: one running timeline, that of a movie or of one sprite instance.
+#pragma once
+
+#include "core/geom/types.h"
+#include "core/stream/parser.h"
+
+class DisplayList;
+class SPlayer;
+class ScriptPlayer;
+struct SCharacter;
+struct SObject;
+
+// A variable of a timeline; both strings owned, the value may be null.
+struct SVariable {
+    SVariable* next;
+    char* name;
+    char* value;
+    SVariable* nextInBucket; // of the name index
+    U32 hash;                // of the folded name
+};
+
+// Results of the operations that run tags; negative values are the loader's error.
+enum SDrawResult : S32 { kDrawn = 0, kNeedsData = 1, kAtEnd = 2, kDrawFailed = -2 };
+
+// Executes a timeline's tags frame by frame: places, moves and removes display objects through the
+// display list and keeps the timeline's variables. Frames count from 0; a frame is the run of tags
+// up to and including its ShowFrame. A sprite's thread is created with its display object and
+// destroyed with it; a movie's is the ScriptPlayer itself. Player thread only.
+class ScriptThread : public SParser {
+public:
+    ScriptPlayer* player = nullptr;     // the movie whose dictionary this timeline uses
+    ScriptThread* nextThread = nullptr; // link of the display list's threads
+    SPlayer* splayer = nullptr;         // the player
+    S32 startPos = 0;                   // first tag
+    S32 len = 0;                        // tags may be read up to here
+    bool atEnd = false;                 // the End tag has run
+    S32 curFrame = -1;                  // last frame whose ShowFrame has run
+    bool seeking = false;               // tags run only to rebuild state: no actions, no sounds
+    bool soundResync = true;            // set by Play and by every seek, for the streaming sound
+    bool soundHold = false;             // the streaming sound's own
+    bool playing = true;                // advances on each tick
+    bool loop = true;                   // goes back to frame 0 at the end
+    S32 numFrames = 0;
+    S32 scriptErr = 0;              // 0, or the loader's error: -1 bad header, -2 out of memory
+    U16 layerDepth = 0;             // depth of rootObject in its parent
+    S32 layerNum = 0;               // level number of a movie's thread; 0 for sprites
+    const char* label = nullptr;    // last FrameLabel seen, in the movie buffer
+    DisplayList* display = nullptr; // where the timeline's objects are
+    SObject* rootObject = nullptr;  // parent of everything that this timeline places
+    bool streamStart = true;        // playback of a root thread stopped or jumped, for the sound
+    SVariable* vars = nullptr;      // in order of creation
+    SVariable* varsTail = nullptr;
+
+    ScriptThread();
+    // Leaves the display list and frees the variables. The root object no longer knows this thread.
+    virtual ~ScriptThread();
+    ScriptThread(const ScriptThread&) = delete;
+    ScriptThread& operator=(const ScriptThread&) = delete;
+
+    // Executes one tag: kAtEnd when the timeline had ended, kNeedsData when the next tag is not all
+    // there (nothing is consumed), else scriptErr.
+    S32 DoTag();
+    // DoTag while curFrame < frame and all goes well; the last result, 0 if nothing ran.
+    S32 DoTags(S32 frame);
+    // Brings the timeline to `frame`. With `seek` the frames passed over run silently, and a frame
+    // already passed is reached by replaying from the start; without it the tags just run on.
+    S32 DrawFrame(S32 frame, bool seek);
+    // One tick: advances by `advance` frames, waits for data, loops or stops at the end. `rebuild`
+    // rebuilds the current frame from the start instead.
+    void DoFrame(S32 advance, bool rebuild);
+    // Stops and shows `frame` (negative counts as 0).
+    void Seek(S32 frame);
+    void StopPlay();
+    // Plays on; with `rewind` a timeline that stands on its last frame without loop starts anew.
+    void Play(bool rewind);
+    // The frame that carries the label, or -1 when it is not there (yet).
+    S32 FindLabel(const char* name);
+
+    // Places a copy of the sprite that `src` drives at `depth` under this timeline's root object.
+    void CloneSprite(ScriptThread* src, const char* name, S32 depth);
+    // Removes the sprite's object; with `keep` an empty sprite takes its place, transform and name.
+    void RemoveSprite(ScriptThread* sprite, bool keep);
+
+    // Back to a timeline without data that has not started.
+    void ClearState();
+
+    // Sets or appends; the name and the value are copied, a null value is stored as null. `flag` is
+    // passed on to the text fields that show the variable.
+    void SetVariable(const char* name, const char* value, int flag);
+    // The first variable of that name under ASCII case folding, or null.
+    SVariable* FindVariable(const char* name);
+    void ClearVariables();
+
+    // This thread is its movie's root timeline.
+    bool IsRoot() const;
+
+private:
+    void Dispatch();
+    void Rewind();
+    bool MakeRootObject();
+    S32 SeekBack(S32 frame);
+    void SeekForward(S32 frame);
+    void StopSound();
+
+    // tag handlers
+    void PlaceObject();
+    void PlaceObject2();
+    void RemoveObject();
+    void SetBackgroundColor();
+    void DefineShape();
+    void DefineMorphShape();
+    void DefineBits();
+    void DefineButton();
+    void DefineFont();
+    void DefineFont2();
+    void DefineText();
+    void DefineEditText();
+    void DefineSound();
+    void DefineSprite();
+    void DefineFontInfo();
+    void DefineButtonExtra();
+    // Reads the id and enters a character of that type; null (and the tag is ignored) when the id
+    // is taken or reserved.
+    SCharacter* NewCharacter(U8 type);
+    // The body of `ch` continues at `pos`.
+    void KeepBody(SCharacter* ch);
+    SCharacter* PlacedCharacter(U16 id);
+
+    SVariable** buckets = nullptr; // name index, grown with the list; null while the list is short
+    U32 bucketCount = 0;
+    U32 variableCount = 0;
+};

@@ -1,0 +1,66 @@
+// The headless shell: the smallest complete one. A hand-cranked clock, a drawing area of a given
+// size, movies fed by the caller, and pictures read straight from the player's bits. The command
+// line and the tests run on it.
+#pragma once
+
+#include "core/player/player.h"
+
+// The hand-cranked clock behind real_time_clock_usecs(): one for the process, starts at 0.
+void SetHeadlessClock(S64 usecs);
+void AdvanceHeadlessClock(S64 usecs);
+
+class NativePlayerWnd : public SPlayer {
+public:
+    // A drawing area of width x height pixels; 0 x 0 takes the movie's own size when its header
+    // arrives.
+    NativePlayerWnd(S32 width, S32 height);
+    ~NativePlayerWnd() override;
+
+    // Bytes of the root movie, in any portions; then the end of the stream.
+    void Feed(const U8* data, size_t n);
+    void EndOfData();
+
+    // Picture 1 is on the screen: frame 0 has been shown.
+    bool Started() const { return loaded != 0; }
+    // The next tick can show what it should: the root timeline has the data of its next frame, or
+    // needs none.
+    bool CanTick() const;
+    // Advances the clock by one frame delay and plays one tick.
+    void Tick();
+    // The pixels as the last tick left them; brings the screen up to date first. Null without
+    // pixels.
+    const CBitBuffer* Picture();
+    // A background colour that no movie overrides; alpha 0 makes the picture transparent.
+    void OverrideBackground(SRGB color);
+
+    S32 Width() const { return width; }
+    S32 Height() const { return height; }
+    bool TimerRuns() const { return timerRuns; }
+    S32 TimerInterval() const { return timerInterval; }
+
+    bool StartTimer(S32 interval, S32 cursorInterval) override;
+    void StopTimer() override;
+    void InvalidateScreenArea(const SRECT* r) override;
+    void ClientRect(SRECT* r) override;
+    void AdjustWindow(S32 width, S32 height) override;
+    void BltToScreen(const SRECT* r) override;
+    void ClearScreen() override;
+    void StreamPostURLNotify(const char* url, const char* target, U32 length, const char* data,
+                             void* notifyData) override;
+    void StreamGetURLNotify(const char* url, const char* target, void* notifyData) override;
+    void CloseStream(StreamData* stream) override;
+    void ProcessFSCommand(const char* command, const char* args) override;
+    void EnableMenus(const MenuStatus& status) override;
+    void UpdateCursor() override;
+
+    SRECT blitted;     // union of what BltToScreen was asked to show since the caller emptied it
+    SRECT invalidated; // the same for InvalidateScreenArea
+
+private:
+    S32 width;
+    S32 height;
+    bool ownSize; // the area follows the movie
+    bool sizeReported = false;
+    bool timerRuns = false;
+    S32 timerInterval = 0;
+};
