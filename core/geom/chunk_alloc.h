@@ -1,66 +1,71 @@
-// Items of one fixed size from blocks of many: thousands of small records come and go per frame
-// without a heap call each. Each owner holds one ChunkAlloc per record type and passes sizeof(T).
-// Not thread-safe. Items are raw memory, aligned for pointers and 64-bit members; destructors are
-// the owner's business. The blocks, and so every item, die with the allocator.
+// Fixed-size items handed out from blocks of many, for records that come and go by the thousand
+// in every frame. Each owner holds one allocator per record size. Not thread-safe.
 #pragma once
 
 #include "core/geom/types.h"
 
 class ChunkAlloc;
 
-// A slot of a block: the word before every item. A free slot keeps the next free slot's address in
-// the caller's area.
+// A slot: the pointer to its block, then the caller's item. While the slot is free the item's
+// first word links to the next free slot.
 struct ChunkSlot;
 
-// Header of one heap allocation; the slots follow.
+// The head of one heap allocation; the slots follow it.
 struct ChunkBlock {
-    U32 tag;             // the owner's marker, for looking at memory
-    ChunkAlloc* owner;   //
-    ChunkBlock* next;    // in creation order
-    ChunkBlock* prev;    //
-    ChunkSlot* freeList; // first free slot
+    U32 tag;             // the owner's marker, for memory dumps only
+    ChunkAlloc* owner;   // the allocator it belongs to
+    ChunkBlock* next;    // younger block
+    ChunkBlock* prev;    // older block
+    ChunkSlot* freeList; // first free slot, null when full
     U16 used;            // items handed out
-    U16 number;          // rank in creation order
+    U32 number;          // age: the n-th block that the owner made
 };
 
+// The allocator drifts back to its oldest blocks, which keeps live items packed and lets younger
+// blocks empty out. Items are plain memory: their destructors are the caller's business, and the
+// allocator's destructor releases every block, items in use or not.
 class ChunkAlloc {
 public:
-    // size: bytes per item (0 counts as 1). itemsPerChunk is brought into 1 to 65535. keepEmpties:
-    // a block stays allocated when its last item is freed, until FreeEmpties. tag: the blocks'
-    // marker. Allocates nothing yet.
+    // size: bytes per item, taken as at least 1. itemsPerChunk: 1 to 65535, clamped. keepEmpties:
+    // a block whose last item is freed stays until FreeEmpties. No memory is taken yet.
     ChunkAlloc(int size, int itemsPerChunk, int keepEmpties, U32 tag);
     ~ChunkAlloc();
     ChunkAlloc(const ChunkAlloc&) = delete;
     ChunkAlloc& operator=(const ChunkAlloc&) = delete;
 
-    // A zeroed item; null when the heap or the budget is exhausted.
+    // An item of zeros, aligned for pointers and 64-bit numbers; null when the heap is exhausted
+    // or the budget spent.
     void* Alloc();
-    // Gives an item of this allocator back; null is ignored. Its block becomes the next to allocate
-    // from when it is older than the current one, which keeps live items packed.
+
+    // Takes back an item of this allocator; null is ignored. Nothing may use the item afterwards.
     void Free(void* item);
-    // Releases every block without items.
+
+    // Releases every block without an item in use.
     void FreeEmpties();
 
-    // No more than maxBlocks blocks from now on: Alloc returns null instead of making another.
+    // From now on no block is made while maxBlocks or more exist.
     void SetBudget(size_t maxBlocks) { budget = maxBlocks; }
 
-    // Bytes per slot, the word before the item included; blocks held now.
     S32 ItemSize() const { return itemSize; }
+    const ChunkBlock* First() const { return first; }
+    const ChunkBlock* Last() const { return last; }
+    const ChunkBlock* Current() const { return current; }
     size_t BlockCount() const { return blockCount; }
 
 private:
     ChunkBlock* CreateChunk();
     void FreeChunk(ChunkBlock* block);
-    ChunkBlock* FindFreeSlot() const;
+    void SelectBlockWithRoom();
 
-    S32 itemSize;
-    S32 itemsPerChunk;
-    U32 tag;
-    S32 nextNumber; // number of the next block
-    bool keepEmpties;
-    ChunkBlock* first;   // all blocks, in creation order
+    S32 itemSize;        // bytes per slot, back pointer included
+    S32 itemsPerChunk;   // slots per block
+    U32 tag;             // copied into every block
+    S32 nextNumber;      // of the next block made
+    S32 keepEmpties;     // not 0: empty blocks stay
+    ChunkBlock* first;   // blocks in the order of their making
     ChunkBlock* last;    //
-    ChunkBlock* current; // the block to allocate from next; every block before it is full
-    size_t blockCount;
-    size_t budget; // most blocks allowed
+    ChunkBlock* current; // where to allocate next; null when every block is full
+    ChunkBlock* oldest;  // no block older than this one has room; null when none has
+    size_t blockCount;   // blocks in the list
+    size_t budget;       // blocks allowed
 };

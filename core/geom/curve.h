@@ -1,163 +1,174 @@
-// Quadratic Bezier pieces, the form of every outline. Parameters are 16.16: 0 at anchor1, 0x10000
-// at anchor2. Results may overwrite an input. Midpoints and differences are formed in 64 bits, so
-// any 32-bit coordinates are safe.
+// Quadratic Bezier pieces, of which all outlines are made, and the integer operations on them.
+// Parameters t are 16.16, 0 at anchor 1 and 0x10000 at anchor 2. Results may be written over an
+// input curve. Everything accepts any 32-bit coordinates; intermediate values are held in 64 bits.
 #pragma once
 
 #include "core/geom/matrix.h"
+#include "core/geom/point.h"
+#include "core/geom/rect.h"
 
 struct CURVE {
     SPOINT anchor1; // start
-    SPOINT control; // for a straight segment the midpoint of the anchors
+    SPOINT control; // for a straight segment the middle of the anchors
     SPOINT anchor2; // end
-    S32 isLine;     // 1: a straight segment
-
-    bool operator==(const CURVE&) const = default;
+    S32 isLine;     // not 0: a straight segment
 };
 
-// State of forward differencing over a curve.
+// Forward differencing along a curve. Positions and differences are in 1/16 unit.
 struct CURVE_STEPPER {
-    U32 steps;   // steps left
-    S32 t;       // parameter of the current point
-    SPOINT cur;  // current point
-    SPOINT prev; // the point before it
-    S32 dt;      // parameter step
-    S64 dx;      // first differences, 1/16 unit
-    S64 dy;
-    S64 d2x; // second differences, 1/16 unit
-    S64 d2y;
-    S64 x; // current position, 1/16 unit
-    S64 y;
+    S32 count;    // steps left
+    S32 t;        // parameter of `point`
+    SPOINT point; // where the curve is now, coordinate units
+    SPOINT prev;  // where it was one step ago
+    S32 dt;       // parameter step, 0x10000 / n
+    S64 dx, dy;   // first differences
+    S64 ddx, ddy; // second differences
+    S64 x, y;     // position
 };
 
-inline S32 MidCoord(S32 v1, S32 v2)
+inline S32 MiddleOf(S32 a, S32 b)
 {
-    return static_cast<S32>((static_cast<S64>(v1) + v2) >> 1);
+    return static_cast<S32>((static_cast<S64>(a) + b) >> 1);
 }
 
-inline SPOINT MidPoint(const SPOINT& p, const SPOINT& q)
+inline void PointMiddle(const SPOINT* p, const SPOINT* q, SPOINT* dst)
 {
-    return {MidCoord(p.x, q.x), MidCoord(p.y, q.y)};
+    *dst = {MiddleOf(p->x, q->x), MiddleOf(p->y, q->y)};
 }
 
-inline void CurveSet(const SPOINT* a1, const SPOINT* c, const SPOINT* a2, CURVE* dst)
-{
-    *dst = {*a1, *c, *a2, 0};
-}
+void CurveSet(const SPOINT* a1, const SPOINT* control, const SPOINT* a2, CURVE* dst);
+void CurveSetLine(const SPOINT* a1, const SPOINT* a2, CURVE* dst);
 
-inline void CurveSetLine(const SPOINT* a1, const SPOINT* a2, CURVE* dst)
-{
-    *dst = {*a1, MidPoint(*a1, *a2), *a2, 1};
-}
-
-// Estimate of the control point's distance from the middle of the chord; 0 for lines.
+// An estimate of the control point's distance from the middle of the chord, in coordinate units,
+// at most kS32Max; 0 for a straight segment.
 inline S32 CurveFlatness(const CURVE* c)
 {
     if (c->isLine)
         return 0;
-    const SPOINT mid = MidPoint(c->anchor1, c->anchor2);
-    const U64 dx = Magnitude(static_cast<S64>(mid.x) - c->control.x);
-    const U64 dy = Magnitude(static_cast<S64>(mid.y) - c->control.y);
-    return SaturateS32(static_cast<S64>(dx + dy - ((dx < dy ? dx : dy) >> 1)));
+    const S64 ex = static_cast<S64>(MiddleOf(c->anchor1.x, c->anchor2.x)) - c->control.x;
+    const S64 ey = static_cast<S64>(MiddleOf(c->anchor1.y, c->anchor2.y)) - c->control.y;
+    const S64 dx = ex < 0 ? -ex : ex;
+    const S64 dy = ey < 0 ? -ey : ey;
+    return Saturate32(dx + dy - ((dx < dy ? dx : dy) >> 1));
 }
 
-// Split at t (0 to 0x10000): first covers 0 to t, second the rest. Both keep isLine.
+// Splits at t; `first` covers 0 to t. Both halves keep isLine.
 void CurveDivide(const CURVE* c, S32 t, CURVE* first, CURVE* second);
 
-// Split at the middle.
+// Splits at the middle by halving, which rounds differently from CurveDivide at 0x8000.
 inline void CurveDivide(const CURVE* c, CURVE* first, CURVE* second)
 {
     const CURVE src = *c;
-    const SPOINT p = MidPoint(src.anchor1, src.control);
-    const SPOINT q = MidPoint(src.control, src.anchor2);
-    const SPOINT m = MidPoint(p, q);
+    SPOINT p, q, m;
+    PointMiddle(&src.anchor1, &src.control, &p);
+    PointMiddle(&src.control, &src.anchor2, &q);
+    PointMiddle(&p, &q, &m);
     *first = {src.anchor1, p, m, src.isLine};
     *second = {m, q, src.anchor2, src.isLine};
 }
 
-// Split at two parameters, in either order, into three pieces from anchor1 on.
-void CurveDivideTwo(const CURVE* c, S32 t1, S32 t2, CURVE* first, CURVE* middle, CURVE* last);
+// Splits at t1 and t2, in either order, into three pieces.
+void CurveDivideTwo(const CURVE* c, S32 t1, S32 t2, CURVE* first, CURVE* second, CURVE* third);
 
-// One coordinate of the curve at t. The middle rounds toward zero, every other t down by term.
-inline S32 CurveCalcCoord(S64 a1, S64 c, S64 a2, S32 t)
+inline S32 CurveCalcCoord(S32 a1, S32 c, S32 a2, S32 t)
 {
-    if (t == kFixedHalf)
-        return static_cast<S32>((a1 + 2 * c + a2) / 4);
-    const S64 t2 = (static_cast<S64>(t) * t) >> 16;
-    return static_cast<S32>(a1 - 2 * (((a1 - c) * t) >> 16) + (((a1 - 2 * c + a2) * t2) >> 16));
+    const S64 from1 = static_cast<S64>(a1) - c;
+    const S64 bend = from1 - c + a2;
+    if (t == 0x8000)
+        return static_cast<S32>((static_cast<S64>(a1) + 2 * static_cast<S64>(c) + a2) / 4);
+    const S32 t2 = FixedMul(t, t);
+    return static_cast<S32>(a1 - 2 * ((from1 * t) >> 16) + ((bend * t2) >> 16));
 }
 
-// The point at t (0 to 0x10000).
+// The point at t. The exact middle is rounded toward zero, all others down.
 inline void CurveCalcPoint(const CURVE* c, S32 t, SPOINT* dst)
 {
-    *dst = {CurveCalcCoord(c->anchor1.x, c->control.x, c->anchor2.x, t),
-            CurveCalcCoord(c->anchor1.y, c->control.y, c->anchor2.y, t)};
+    const S32 x = CurveCalcCoord(c->anchor1.x, c->control.x, c->anchor2.x, t);
+    const S32 y = CurveCalcCoord(c->anchor1.y, c->control.y, c->anchor2.y, t);
+    *dst = {x, y};
 }
 
-// Bounds of the anchors and, for curves, the control point: a hull, on purpose not tight.
-void CurveBounds(const CURVE* c, SRECT* dst);
-// Bounds of the curve itself, rounded outward.
-void CurveTightBounds(const CURVE* c, SRECT* dst);
+// The box around anchors and control point: it holds the curve but is deliberately not tight.
+void CurveBounds(const CURVE* c, SRECT* r);
+// The box around the curve itself, rounded outwards to whole units.
+void CurveTightBounds(const CURVE* c, SRECT* r);
 
-// Parameter of the extremum of one coordinate (anchor, control, anchor), rounded toward zero; -1
-// when none lies strictly between the ends.
+// Parameter at which one coordinate (anchor, control, anchor) turns, or -1 when none lies inside
+// the piece.
 S32 CurveCalcExtreme(S32 a1, S32 c, S32 a2);
-// The same for x and y; -1 twice for a line.
+// The same for x and for y.
 void CurveExtrema(const CURVE* c, S32* tx, S32* ty);
-// True when the control point lies outside the anchors' range in x or in y; never for lines.
+// True when the control point lies outside the anchors' range on either axis, that is when the
+// piece is not monotonic on both.
 bool CurveIsExtreme(const CURVE* c);
 
-// Prepares n steps. The first difference has no half-second-difference term, so the last point is
-// off anchor2 by (anchor1 - 2 control + anchor2) / n; that is intended.
+// Starts differencing in n steps; with n = 0 there is no step to take. The first difference
+// deliberately carries no half of the second: after n steps the position differs from anchor 2 by
+// (a1 - 2c + a2) / n.
 void CurveInitStepper(const CURVE* c, U16 n, CURVE_STEPPER* s);
-// Moves to the next point; false when no steps are left.
-bool CurveStep(CURVE_STEPPER* s);
 
-inline void CurveReverse(const CURVE* c, CURVE* dst)
+// Moves one step on; false when no steps are left.
+inline bool CurveStep(CURVE_STEPPER* s)
 {
-    *dst = {c->anchor2, c->control, c->anchor1, c->isLine};
+    if (s->count <= 0)
+        return false;
+    s->count--;
+    s->x += s->dx;
+    s->y += s->dy;
+    s->dx += s->ddx;
+    s->dy += s->ddy;
+    s->t += s->dt;
+    s->prev = s->point;
+    s->point = {static_cast<S32>(s->x >> 4), static_cast<S32>(s->y >> 4)};
+    return true;
 }
 
+void CurveReverse(const CURVE* c, CURVE* dst);
 void CurveTransform(const CURVE* c, const MATRIX* m, CURVE* dst);
 
-// Direction of travel at t, 16.16 degrees, -180 to 180. Where the derivative is nothing (a control
-// point on an anchor) the direction of the curve next to it; 90 for a curve that is a single point.
+// Direction of travel at t in 16.16 degrees. Where the curve stands still (a control point on an
+// anchor, a cusp) that of the chord.
 S32 CurveTangentAngle(const CURVE* c, S32 t);
 
-// Arc length, saturated at kS32Max; the parameter at which the curve is len long, 0 to 0x10000.
+// Arc length in coordinate units, by 64 chords; good to about 0.02%.
 S32 CurveLength(const CURVE* c);
-S32 CurveFindLength(const CURVE* c, S32 len);
+// Parameter of the point `length` along the curve, from 0 to 0x10000.
+S32 CurveFindLength(const CURVE* c, S32 length);
 
-// Sets dst to the point of the curve nearest to p. Returns its parameter, or -1 when it is farther
-// away than tolerance.
+// The point of the curve nearest to p, found to within `tolerance` units (not below 1); returns
+// its parameter.
 S32 CurveNearestPoint(const CURVE* c, const SPOINT* p, S32 tolerance, SPOINT* dst);
 
-// How often (0 to 2) the curve crosses the horizontal ray that goes from p toward +x, at x strictly
-// greater than p->x. Each piece that is monotonic in y owns its upper end but not its lower one
-// (ymin <= y < ymax), so that chained pieces count a shared point once, and a tangent touch counts
-// 0 or 2. Pieces whose control point is within tolerance of the chord's middle are taken as their
-// chord; 0 asks for full precision, which is exact for coordinates of 16 bits up to crossings less
-// than 2^-20 units from p.
+// How often the curve crosses the horizontal ray from p towards +x: 0, 1 or 2. A crossing counts
+// when it lies strictly right of p. A y-monotonic stretch crosses when ymin <= p.y < ymax, so that
+// the counts of a closed outline add up whatever vertices lie on the ray; this part is exact for
+// all coordinates. Whether a curved piece crosses left or right of p is resolved to 1/65536 unit
+// for coordinates within +-32768, and more coarsely for larger ones. A tolerance above 0 lets the
+// search end as soon as the remaining stretch is that narrow.
 int CurveXRaySect(const CURVE* c, const SPOINT* p, U16 tolerance);
 
-// Looks for an intersection of c1 at or after parameter from1 with c2 at or after from2, by halving
-// both as long as their bounds meet. True with the two parameters of the one found first along c1;
-// false when there is none or the bounded search gives up (long stretches closer than a unit).
-bool CurveBoundsSect(const CURVE* c1, const CURVE* c2, S32 from1, S32 from2, S32* t1, S32* t2);
+// Looks for an intersection of two curves by halving both while their boxes meet, at most
+// `maxDepth` times (0 to 16), until both are no larger than `tolerance` units. On success gives
+// the parameters on both; the one found lies first along c1. False when there is none, or when the
+// search has tried 4096 pairs.
+bool CurveBoundsSect(const CURVE* c1, const CURVE* c2, S32 tolerance, S32 maxDepth, S32* t1,
+                     S32* t2);
 
-// Moves the anchors to a1 and a2. The control point goes where the tangents at both ends, moved
-// along, meet; where they are nearly parallel or meet behind an anchor it moves by the average of
-// the two shifts. A line stays a line.
+// The curve moved to new anchors: it keeps the directions at both ends, with the control point
+// where the end tangents then meet. Where they do not meet ahead of the curve the control point
+// moves by the average of the anchors' moves. A straight segment stays one.
 void CurveAdjust(const CURVE* c, const SPOINT* a1, const SPOINT* a2, CURVE* dst);
 
-// The parameter of a point on (or next to) a straight curve, 0 to 0x10000; 0 without extent.
+// Parameter, 0 to 0x10000, of the point of a straight curve nearest to p.
 S32 CurveLineCalcParam(const CURVE* c, const SPOINT* p);
 
-// t0 + 2 dt * (t - 0x8000), rounded down: t = 0 gives t0 - dt and t = 0x10000 gives t0 + dt.
+// Parameter on the whole curve of the parameter t of a piece of it whose middle is t0 and whose
+// half width is dt.
 inline S32 CurveParamInterpolate(S32 t0, S32 dt, S32 t)
 {
     return static_cast<S32>(t0 +
                             ((2 * static_cast<S64>(dt) * (static_cast<S64>(t) - 0x8000)) >> 16));
 }
 
-// Makes the curve a vertical straight segment at x between its anchors' y, in the same direction.
+// Makes c the vertical straight segment at x between its anchors' heights, in its direction.
 void MakeVertLine(CURVE* c, S32 x);

@@ -1,15 +1,15 @@
-// An array of plain records that grows by doubling and reports a full heap by its return value. It
-// replaces std::vector where nothing may throw and where a frame reuses the memory of the last one.
+// A growing array of plain records that reports an exhausted heap instead of ending the program.
 #pragma once
 
 #include <cstdlib>
-#include <cstring>
 #include <type_traits>
 
 #include "core/geom/types.h"
 
+// Elements are moved by realloc and never constructed or destroyed. Pointers into the buffer hold
+// until the next Reserve or Push.
 template <typename T> class GrowBuffer {
-    static_assert(std::is_trivially_copyable_v<T>, "items are moved by realloc");
+    static_assert(std::is_trivially_copyable_v<T>);
 
 public:
     GrowBuffer() = default;
@@ -17,65 +17,48 @@ public:
     GrowBuffer(const GrowBuffer&) = delete;
     GrowBuffer& operator=(const GrowBuffer&) = delete;
 
-    // Room for at least n items. False, and nothing changes, when the heap is exhausted.
+    // Makes room for n elements in all. False, with nothing changed, when the heap is exhausted.
     bool Reserve(size_t n)
     {
         if (n <= capacity)
             return true;
-        const size_t most = static_cast<size_t>(-1) / 2 / sizeof(T);
-        if (n > most)
+        if (n > kMaxItems)
             return false;
-        size_t grown = capacity < 8 ? 8 : capacity > most / 2 ? most : capacity * 2;
-        grown = grown < n ? n : grown;
-        T* moved = static_cast<T*>(std::realloc(static_cast<void*>(items), grown * sizeof(T)));
-        if (moved == nullptr)
+        size_t wanted = capacity < kMaxItems / 2 ? capacity * 2 : kMaxItems;
+        wanted = wanted < 8 ? 8 : wanted;
+        wanted = wanted < n ? n : wanted;
+        void* grown = std::realloc(static_cast<void*>(items), wanted * sizeof(T));
+        if (!grown)
             return false;
-        items = moved;
-        capacity = grown;
+        items = static_cast<T*>(grown);
+        capacity = wanted;
         return true;
     }
 
     // Appends a copy; false when the heap is exhausted.
-    bool Push(T value)
+    bool Push(T item)
     {
         if (count == capacity && !Reserve(count + 1))
             return false;
-        items[count++] = value;
+        items[count++] = item;
         return true;
     }
 
-    // Makes the size n, new items as zero bytes; false, and nothing changes, when the heap is
-    // exhausted.
-    bool Resize(size_t n)
-    {
-        if (!Reserve(n))
-            return false;
-        if (n > count)
-            std::memset(static_cast<void*>(items + count), 0, (n - count) * sizeof(T));
-        count = n;
-        return true;
-    }
-
-    // Drops the items from n on (a larger n changes nothing); Clear drops all. Both keep the
-    // memory.
+    // Drops all elements past the first n.
     void Truncate(size_t n) { count = n < count ? n : count; }
+    // Drops all elements and keeps the memory.
     void Clear() { count = 0; }
 
-    size_t size() const { return count; }
-    bool empty() const { return count == 0; }
     T* data() { return items; }
     const T* data() const { return items; }
+    size_t size() const { return count; }
     T& operator[](size_t i) { return items[i]; }
     const T& operator[](size_t i) const { return items[i]; }
-    T& Back() { return items[count - 1]; }
-    const T& Back() const { return items[count - 1]; }
-    T* begin() { return items; }
-    T* end() { return items + count; }
-    const T* begin() const { return items; }
-    const T* end() const { return items + count; }
 
 private:
+    static constexpr size_t kMaxItems = (static_cast<size_t>(-1) / 2) / sizeof(T);
+
     T* items = nullptr;
-    size_t count = 0;
-    size_t capacity = 0;
+    size_t count = 0;    // elements held
+    size_t capacity = 0; // elements there is room for
 };

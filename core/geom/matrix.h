@@ -1,51 +1,40 @@
-// Affine transforms: x' = a x + c y + tx, y' = b x + d y + ty. a to d are 16.16, tx and ty are in
-// coordinate units. Every product is rounded down by itself. Results may overwrite an input.
+// Affine transforms: x' = a*x + c*y + tx, y' = b*x + d*y + ty. Every product is rounded down on its
+// own. Results may be written over an input.
 #pragma once
 
+#include "core/geom/point.h"
 #include "core/geom/rect.h"
 
 struct MATRIX {
-    S32 a;
-    S32 b;
-    S32 c;
-    S32 d;
-    S32 tx;
-    S32 ty;
-
-    bool operator==(const MATRIX&) const = default;
+    S32 a;  // x to x, 16.16
+    S32 b;  // x to y, 16.16
+    S32 c;  // y to x, 16.16
+    S32 d;  // y to y, 16.16
+    S32 tx; // coordinate units
+    S32 ty; // coordinate units
 };
 
 inline void MatrixIdentity(MATRIX* m)
 {
-    *m = {kFixedOne, 0, 0, kFixedOne, 0, 0};
+    *m = {0x10000, 0, 0, 0x10000, 0, 0};
 }
-// Scales are 16.16.
-inline void MatrixScale(S32 sx, S32 sy, MATRIX* m)
-{
-    *m = {sx, 0, 0, sy, 0, 0};
-}
-inline void MatrixTranslate(S32 dx, S32 dy, MATRIX* m)
-{
-    *m = {kFixedOne, 0, 0, kFixedOne, dx, dy};
-}
-// angle in 16.16 degrees.
+
+void MatrixScale(S32 sx, S32 sy, MATRIX* m);
+void MatrixTranslate(S32 dx, S32 dy, MATRIX* m);
+// Rotation about the origin by 16.16 degrees.
 void MatrixRotate(S32 angle, MATRIX* m);
 
 bool MatrixIsIdentity(const MATRIX* m);
-// True without mirroring and with a skew of at most 16/65536.
+// True when both scales are positive and the skews are within 16/65536.
 bool MatrixIsScaleOnly(const MATRIX* m);
-// Every field within tol.
+// True when every field is within tol.
 bool MatrixEqual(const MATRIX* m1, const MATRIX* m2, S32 tol);
 
-// The transform without the translation.
+// A vector: without the translation.
 inline void MatrixDeltaTransformPoint(const MATRIX* m, const SPOINT* p, SPOINT* dst)
 {
-    S32 x = FixedMul(m->a, p->x);
-    S32 y = FixedMul(m->d, p->y);
-    if (m->c != 0)
-        x += FixedMul(m->c, p->y);
-    if (m->b != 0)
-        y += FixedMul(m->b, p->x);
+    const S32 x = FixedMul(m->a, p->x) + FixedMul(m->c, p->y);
+    const S32 y = FixedMul(m->d, p->y) + FixedMul(m->b, p->x);
     *dst = {x, y};
 }
 
@@ -56,28 +45,29 @@ inline void MatrixTransformPoint(const MATRIX* m, const SPOINT* p, SPOINT* dst)
     dst->y += m->ty;
 }
 
-// The bounding box of the transformed corners; empty stays empty.
+// The bounding box of the four transformed corners; an empty r gives an empty dst.
 void MatrixTransformRect(const MATRIX* m, const SRECT* r, SRECT* dst);
 
 // m1 followed by m2.
 void MatrixConcat(const MATRIX* m1, const MATRIX* m2, MATRIX* dst);
 
-// The inverse. A matrix without one gives the identity, but a pure scale with a zero gives a zero
-// there. Matrices with skew whose largest entry lies between about 32.0 and 8192.0 come out
-// distorted; that is the required behaviour.
+// The inverse, or the identity when there is none. Without skews each scale is inverted alone (0
+// stays 0). With skews the result is good to about 16 bits when the largest of a to d is below
+// 2^22 or at least 2^29, and distorted between: pictures depend on exactly these numbers.
 void MatrixInvert(const MATRIX* m, MATRIX* dst);
 
-// The scale and translation that take src to dst. x is anchored at the minimum edges, y at the
-// maximum edges; a source without extent counts as 1 wide or high.
+// Scale and translation that take src onto dst. x is anchored at the minimum edges, y deliberately
+// at the maximum edges.
 void MatrixMap(const SRECT* src, const SRECT* dst, MATRIX* m);
-// The same with the smaller of the two scales for both axes, centre on centre.
+// The same with the smaller of the two scales on both axes and the centres matched.
 void MatrixMapAspect(const SRECT* src, const SRECT* dst, MATRIX* m);
 
-// Lengths of the two axes (16.16) and the direction of the first one (16.16 degrees).
+// The lengths of the images of the two axes (16.16) and the direction of the x axis's (16.16
+// degrees).
 void MatrixDecompose(const MATRIX* m, SPOINT* scale, S32* rot);
 
-// The width that a line of width t has after the transform; at least 1 when t is.
+// A line width under m: a width of 1 or more stays at least 1.
 S32 MatrixTransformThickness(const MATRIX* m, S32 t);
 
-// Every field m0 + (m1 - m0) * t, t in 16.16.
+// Every field from m0 (t = 0) to m1 (t = 0x10000).
 void Interpolate(const MATRIX* m0, const MATRIX* m1, S32 t, MATRIX* dst);

@@ -1,72 +1,58 @@
-// Points and vectors on integer coordinates (twips in movie space, device units after the camera).
-// Results go to an out-parameter, which may be one of the inputs. Differences are formed in 64 bits
-// where a 32-bit one could wrap.
+// Points and vectors in 32-bit coordinates (twips, or device units once transformed), and the
+// functions on them. Results may be written over an input.
 #pragma once
 
 #include "core/geom/fixed.h"
 
 struct SPOINT {
-    S32 x;
-    S32 y;
-
-    bool operator==(const SPOINT&) const = default;
+    S32 x; // coordinate units
+    S32 y; // coordinate units, growing downwards on the screen
 };
 
-// Length of (dx, dy) by the interpolated table, in coordinate units: within 1 part in 30,000 of the
-// true length, never more than one unit below it besides, and saturated at kS32Max. For |dx|, |dy|
-// below 2^45.
-S32 VectorLength(S64 dx, S64 dy);
-// The same, not saturated.
-U64 VectorLengthWide(S64 dx, S64 dy);
+// True when both coordinates differ by at most tol.
+bool PointEqual(const SPOINT* p1, const SPOINT* p2, S32 tol);
 
-// Both coordinates within tol of each other.
-inline bool PointEqual(const SPOINT* p1, const SPOINT* p2, S32 tol)
-{
-    return WithinTolerance(p1->x, p2->x, tol) && WithinTolerance(p1->y, p2->y, tol);
-}
-
-// v1 + (v2 - v1) * t, t in 16.16, the product rounded down: t = 0 gives v1.
-inline S32 FixedInterpolate(S32 v1, S32 v2, S32 t)
-{
-    return static_cast<S32>(v1 + (((static_cast<S64>(v2) - v1) * t) >> 16));
-}
-
-// p2 + (p1 - p2) * t, t in 16.16: the weight t belongs to the first point.
+// The point between p2 (t = 0) and p1 (t = 0x10000): the weight belongs to the first point.
 inline void PointAverage(const SPOINT* p1, const SPOINT* p2, S32 t, SPOINT* dst)
 {
-    *dst = {FixedInterpolate(p2->x, p1->x, t), FixedInterpolate(p2->y, p1->y, t)};
+    *dst = {FixedLerp(p2->x, p1->x, t), FixedLerp(p2->y, p1->y, t)};
 }
 
-// Both coordinates shifted: left when n >= 0, right with rounding when n < 0.
-inline void PointShift(const SPOINT* p, int n, SPOINT* dst)
-{
-    *dst = {ShiftRounded(p->x, n), ShiftRounded(p->y, n)};
-}
+// One coordinate shifted by n bits: left when n >= 0, else right with rounding, halves upwards.
+S32 ShiftRounded(S32 v, int n);
+// Both coordinates by ShiftRounded.
+void PointShift(const SPOINT* p, int n, SPOINT* dst);
 
-// Both coordinates times s (16.16).
-inline void PointScale(const SPOINT* p, S32 s, SPOINT* dst)
-{
-    *dst = {FixedMul(p->x, s), FixedMul(p->y, s)};
-}
+// Both coordinates times s (16.16), each rounded down.
+void PointScale(const SPOINT* p, S32 s, SPOINT* dst);
 
-// Table length of the vector; distance of two points.
+// Length of a vector whose extents are given as magnitudes: the longer one times an interpolated
+// table of sqrt(1 + r*r), good to 0.005%. Lengths beyond 32 bits give the greatest value.
+S32 VectorLength(U32 dx, U32 dy);
+
+// VectorLength of the vector p, and of the vector between two points.
 S32 PointLength(const SPOINT* p);
 S32 PointDistance(const SPOINT* p1, const SPOINT* p2);
 
-// A quick estimate of the length: the sum of the magnitudes less half the smaller one.
+// |x| + |y| - min(|x|, |y|) / 2: an estimate of the length, 0 to 12% long.
 S32 PointFastLength(const SPOINT* p);
-// Half the larger of the two differences. Not the estimate of PointFastLength: callers rely on it.
+
+// Half of the larger coordinate difference. Deliberately another formula than PointFastLength's:
+// callers rely on this value.
 S32 PointFastDistance(const SPOINT* p1, const SPOINT* p2);
 
-// Scales the vector to the length len; a vector shorter than 1 stays as it is.
+// Makes p a vector of length len in the same direction; a vector shorter than 1 stays as it is.
 void PointNormalize(SPOINT* p, S32 len);
 
-// The point at distance r and angle (16.16 degrees), seen from origin (null: from (0, 0)).
+// The point at distance r from origin (from (0,0) when null) in direction angle, 16.16 degrees.
 void PointPolar(S32 r, S32 angle, const SPOINT* origin, SPOINT* dst);
-// The angle of p seen from origin (null: from (0, 0)), 16.16 degrees, -180 to 180.
+
+// Direction of p seen from origin (from (0,0) when null): 16.16 degrees from -180 to 180. Two
+// coinciding points give 90 degrees.
 S32 PointAngle(const SPOINT* p, const SPOINT* origin);
 
-// The point of the segment a-b nearest to p, and the foot of the perpendicular from p on the
-// endless line through a and b, both rounded to nearest. A segment without length gives a.
+// The point of the segment a-b nearest to p, rounded to whole units.
 void PointNearestLine(const SPOINT* p, const SPOINT* a, const SPOINT* b, SPOINT* dst);
+
+// The foot of the perpendicular from p on the endless line through a and b; a when they coincide.
 void PointPerpNearestLine(const SPOINT* p, const SPOINT* a, const SPOINT* b, SPOINT* dst);
