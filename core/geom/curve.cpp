@@ -61,7 +61,6 @@ S64 SecondDifference(S32 a1, S32 c, S32 a2, S64 dt)
     return (bend * (((dt * dt) >> 16) << 5)) >> 16;
 }
 
-// The four products that decide where two end tangents meet.
 struct Vector {
     S64 x;
     S64 y;
@@ -72,12 +71,14 @@ Vector Between(const SPOINT& from, const SPOINT& to)
     return {static_cast<S64>(to.x) - from.x, static_cast<S64>(to.y) - from.y};
 }
 
-S64 Cross(const Vector& a, const Vector& b)
+bool NeedsShortening(const Vector& v)
 {
-    // Halved twice, the 33-bit differences of full-range coordinates leave room for the sum.
     constexpr S64 kExact = S64{1} << 30;
-    const auto large = [](S64 v) { return v >= kExact || v <= -kExact; };
-    const int shift = large(a.x) || large(a.y) || large(b.x) || large(b.y) ? 3 : 0;
+    return v.x >= kExact || v.x <= -kExact || v.y >= kExact || v.y <= -kExact;
+}
+
+S64 Cross(const Vector& a, const Vector& b, int shift)
+{
     return (a.x >> shift) * (b.y >> shift) - (a.y >> shift) * (b.x >> shift);
 }
 
@@ -198,9 +199,11 @@ void CurveAdjust(const CURVE* c, const SPOINT* a1, const SPOINT* a2, CURVE* dst)
     const Vector out = Between(c->anchor1, c->control);
     const Vector in = Between(c->control, c->anchor2);
     const Vector chord = Between(*a1, *a2);
-    const S64 turn = Cross(out, in);
-    const S64 alongOut = Cross(chord, in);
-    const S64 alongIn = Cross(out, chord);
+    // One shift for all three products, as their ratios count.
+    const int shift = NeedsShortening(out) || NeedsShortening(in) || NeedsShortening(chord) ? 3 : 0;
+    const S64 turn = Cross(out, in, shift);
+    const S64 alongOut = Cross(chord, in, shift);
+    const S64 alongIn = Cross(out, chord, shift);
     SPOINT control;
     if (SameSign(turn, alongOut) && SameSign(turn, alongIn)) {
         control = {Saturate32(S64{a1->x} + ScaleByRatio(out.x, alongOut, turn)),

@@ -135,22 +135,22 @@ S32 CurveLength(const CURVE* c);
 // Parameter of the point `length` along the curve, from 0 to 0x10000.
 S32 CurveFindLength(const CURVE* c, S32 length);
 
-// The point of the curve nearest to p, found to within `tolerance` units (not below 1); returns
-// its parameter.
+// The point of the curve nearest to p, its distance found to within `tolerance` + 2 units (a
+// tolerance below 1 counts as 1); returns its parameter.
 S32 CurveNearestPoint(const CURVE* c, const SPOINT* p, S32 tolerance, SPOINT* dst);
 
 // How often the curve crosses the horizontal ray from p towards +x: 0, 1 or 2. A crossing counts
 // when it lies strictly right of p. A y-monotonic stretch crosses when ymin <= p.y < ymax, so that
 // the counts of a closed outline add up whatever vertices lie on the ray; this part is exact for
-// all coordinates. Whether a curved piece crosses left or right of p is resolved to 1/65536 unit
-// for coordinates within +-32768, and more coarsely for larger ones. A tolerance above 0 lets the
-// search end as soon as the remaining stretch is that narrow.
+// all coordinates. Whether a crossing lies left or right of p is exact for straight segments and
+// resolved to 1/65536 unit for curves, both within +-2^27 and +-32768 units of p, and more coarsely
+// farther away. A tolerance above 0 lets the search end when the rest is that narrow, in units.
 int CurveXRaySect(const CURVE* c, const SPOINT* p, U16 tolerance);
 
-// Looks for an intersection of two curves by halving both while their boxes meet, at most
-// `maxDepth` times (0 to 16), until both are no larger than `tolerance` units. On success gives
-// the parameters on both; the one found lies first along c1. False when there is none, or when the
-// search has tried 4096 pairs.
+// Looks for an intersection of two curves by halving both while their boxes meet, until both boxes
+// are at most `tolerance` units wide and high or have been halved `maxDepth` times (0 to 16). Gives
+// the parameters on both curves of the intersection found, the first one along c1. False when there
+// is none or when 4096 pairs have been tried.
 bool CurveBoundsSect(const CURVE* c1, const CURVE* c2, S32 tolerance, S32 maxDepth, S32* t1,
                      S32* t2);
 

@@ -147,3 +147,11 @@ void PointPerpNearestLine(const SPOINT* p, const SPOINT* a, const SPOINT* b, SPO
 {
     *dst = PointAtFoot(FootOnLine(p, a, b), a, b);
 }
+
+S32 PointLineParam(const SPOINT* p, const SPOINT* a, const SPOINT* b)
+{
+    const Foot foot = FootOnLine(p, a, b);
+    if (foot.num <= 0)
+        return 0;
+    return foot.num >= foot.den ? 0x10000 : ScaleByRatio(0x10000, foot.num, foot.den);
+}

@@ -56,3 +56,6 @@ void PointNearestLine(const SPOINT* p, const SPOINT* a, const SPOINT* b, SPOINT*
 
 // The foot of the perpendicular from p on the endless line through a and b; a when they coincide.
 void PointPerpNearestLine(const SPOINT* p, const SPOINT* a, const SPOINT* b, SPOINT* dst);
+
+// How far along the segment a-b its point nearest to p lies, 0 to 0x10000; 0 when a and b coincide.
+S32 PointLineParam(const SPOINT* p, const SPOINT* a, const SPOINT* b);
