@@ -15,6 +15,12 @@
 
 struct RActiveEdge;
 
+// An entry of the active list: the edge, and its x beside it for sorting.
+struct RActiveRef {
+    S32 x;
+    RActiveEdge* edge;
+};
+
 // A piece of one sub-scanline: everything from where the last piece ended up to xmax shows one
 // stack.
 struct RSpan {
@@ -88,6 +94,9 @@ public:
     U32* AllocRamp();
     void FreeRamp(U32* ramp);
 
+    // Tells the units of edges that are built before any paint; Attach sets them as well.
+    void SetAntialias(int on) { antialias = on; }
+
     // --- for the paint procedures of the colours ---
     U8* RowBits() const { return rowBits; }
     const CPixelOps* Ops() const { return ops; }
@@ -98,46 +107,57 @@ private:
     static constexpr U64 kMaxWork =
         1ull << 28; // edge and stack steps of one paint; then rows stay unpainted
 
-    void AddBucketEdges(REdge* edges);
-    void SetLayer(RColor* colors, RColor* clip);
+    void ClearArea();
 
     // active.cpp: edges entering, moving and leaving
     void AddActive();
     bool SetUpActive(const REdge* edge);
     void SortActive();
+    void SortAll();
     void FreeActive();
 
     // crossing.cpp: the colour stack
     void PaintActive();
     void CrossEdge(const RActiveEdge* edge);
     void ToggleColor(RColor* c, S32 x);
-    void CountColor(RColor* c, S32 x, int dir);
+    void CountColor(RColor* c, S32 x, S8 dir);
+    void SwitchOn(RColor* c, S32 x, U8 count);
+    void SwitchOff(RColor* c, S32 x);
+    RColor** FindPlace(RColor* c, S32 x);
     void ClearStack();
+    bool ClipIsOn(const RColor* c);
     int Collect();
     void PaintSlab(S32 x);
 
-    // slab.cpp: spans without anti-aliasing
+    // slab.cpp: spans of whole pixels
     void DrawCollected(S32 x0, S32 x1, RColor* const* colors, int count);
     void CompositeSlab(S32 x0, S32 x1, RColor* const* colors, int count);
     void ReadBackground(S32 x, S32 n, RGBI* dst) const;
-    Lanes BackgroundPixel(S32 x) const;
+    bool BackgroundCovers() const;
+    void BlendToOutput(S32 x, RGBI* src, S32 n);
+    void BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst, bool over);
 
     // aa_runs.cpp: spans with anti-aliasing
-    void BeginSubline();
-    void EndSubline();
+    void BeginRow();
     void RecordSpan(S32 xmax);
+    void PushSpan(S32 xmax, U32 stack);
+    void EndSubline();
+    bool SameStack(const RStack& stack, int count) const;
     U32 InternStack(int count);
-    U32 NewStack(int count);
+    U32 NewStack(int count, U32 next);
     void PaintAARuns();
     void MakeRun(RRun* run) const;
     void PaintRun(const RRun& run);
     Lanes CalcColor(const RRun& run, S32 x);
     Lanes StackColor(const RStack& stack, S32 x);
+    Lanes PixelColor(RColor* c, S32 x);
+    RGBI BitmapPixel(RColor* c, S32 x);
     void AddCoverage(S32 x, Lanes value);
     void EmitCoverage();
     void EmitPixel(S32 x, Lanes value);
     void FlushPixels();
     void PaintInterior(const RRun& run, S32 x0, S32 x1);
+    void PaintFlat(Lanes value, S32 x0, S32 x1);
     void PaintStackInterior(const RStack& stack, S32 x0, S32 x1);
 
     CBitBuffer* output = nullptr;
@@ -150,15 +170,16 @@ private:
     SRECT area = {};    // painted pixels, half-open
     SRECT areaDev = {}; // the same in device units
 
-    U32 layer = 0;
+    U32 layer = 0;           // of the next object
+    bool layersFull = false; // no further object fits above
     U64 work = 0;
     S32 y = 0;      // current scanline, device units
     S32 paintX = 0; // where the next span begins
     RColor* stackTop = nullptr;
     RColor* collected[kMaxCollected];
 
-    GrowBuffer<REdge*> buckets;      // a list head per scanline of areaDev
-    GrowBuffer<RActiveEdge*> active; // sorted by x once SortActive has run
+    GrowBuffer<REdge*> buckets;    // a list head per scanline of areaDev
+    GrowBuffer<RActiveRef> active; // sorted by x once SortActive has run
     ChunkAlloc activeAlloc;
     ChunkAlloc rampAlloc;
     bool needsSort = false;

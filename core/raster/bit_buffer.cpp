@@ -1,0 +1,79 @@
+#include "core/raster/bit_buffer.h"
+
+#include <algorithm>
+#include <cstdlib>
+
+#include "core/player/limits.h"
+
+static U32 Pack32(const RGBI& c)
+{
+    return PackLanes(ToLanes(c));
+}
+
+static U32* Pixels32(U8* row, S32 x)
+{
+    return reinterpret_cast<U32*>(row) + x;
+}
+
+static void ReadRow32(const U8* row, S32 x, RGBI* dst, S32 n)
+{
+    const U32* src = reinterpret_cast<const U32*>(row) + x;
+    for (S32 i = 0; i < n; ++i)
+        dst[i] = FromLanes(UnpackLanes(src[i]));
+}
+
+static void WriteRow32(U8* row, S32 x, const RGBI* src, S32 n)
+{
+    U32* dst = Pixels32(row, x);
+    for (S32 i = 0; i < n; ++i)
+        dst[i] = PackLanes(ToLanes(src[i]));
+}
+
+static void FillRow32(U8* row, S32 x, U32 packed, S32 n)
+{
+    std::fill_n(Pixels32(row, x), n, packed);
+}
+
+static void RampRow32(U8* row, S32 x, const U32* ramp, const U16* index, S32 n)
+{
+    U32* dst = Pixels32(row, x);
+    for (S32 i = 0; i < n; ++i)
+        dst[i] = ramp[index[i]];
+}
+
+static const CPixelOps kOps32 = {32, Pack32, ReadRow32, WriteRow32, FillRow32, RampRow32};
+
+const CPixelOps* PixelOps(CPixelFormat)
+{
+    return &kOps32;
+}
+
+CBitBuffer::~CBitBuffer()
+{
+    FreeBits();
+}
+
+bool CBitBuffer::CreateScreenBits(S32 w, S32 h, CPixelFormat pixelFormat, bool rowsBottomUp)
+{
+    FreeBits();
+    if (w <= 0 || h <= 0 || w > kMaxSide || h > kMaxSide || U32(w) * U32(h) > gLimits.surfacePixels)
+        return false;
+    // Rows start at multiples of 16 bytes.
+    S32 bytes = ((w * PixelOps(pixelFormat)->bitsPerPixel + 127) >> 7) << 4;
+    base = static_cast<U8*>(std::calloc(size_t(h), size_t(bytes)));
+    if (!base)
+        return false;
+    width = w;
+    height = h;
+    rowBytes = bytes;
+    format = pixelFormat;
+    bottomUp = rowsBottomUp;
+    return true;
+}
+
+void CBitBuffer::FreeBits()
+{
+    std::free(base);
+    base = nullptr;
+    width = height = rowBytes = 0;
+}

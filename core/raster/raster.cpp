@@ -1,0 +1,150 @@
+// Life of a paint: area, buckets, layers, and the walk over the scanlines.
+#include "core/raster/raster.h"
+
+#include <algorithm>
+
+#include "core/raster/active_edge.h"
+
+CRaster::CRaster()
+    : ops(PixelOps(kPixel32)), activeAlloc(sizeof(RActiveEdge), 64, 1, 0x33333333),
+      rampAlloc(kRampEntries * sizeof(U32), 16, 1, 0xEEEEEEEE)
+{
+    BuildRenderTables();
+}
+
+CRaster::~CRaster() = default;
+
+void CRaster::Attach(CBitBuffer* to, const SRECT* r, int aa)
+{
+    output = to;
+    ops = to ? to->Ops() : PixelOps(kPixel32);
+    antialias = aa;
+    alphaOutput = false;
+    area = {};
+    if (BitsValid() && !RectIsEmpty(r)) {
+        area.xmin = std::clamp(r->xmin, 0, to->Width());
+        area.xmax = std::clamp(r->xmax, area.xmin, to->Width());
+        area.ymin = std::clamp(r->ymin, 0, to->Height());
+        area.ymax = std::clamp(r->ymax, area.ymin, to->Height());
+    }
+    S32 scale = aa ? 4 : 1;
+    areaDev = {area.xmin * scale, area.xmax * scale, area.ymin * scale, area.ymax * scale};
+}
+
+void CRaster::SetBackgroundBits(CBitBuffer* background)
+{
+    backgroundBits = background;
+}
+
+void CRaster::UseAlphaChannel()
+{
+    alphaOutput = true;
+}
+
+bool CRaster::BitsValid() const
+{
+    return output && output->HasBits();
+}
+
+void CRaster::BeginPaint()
+{
+    FreeActive();
+    stackTop = nullptr;
+    needsSort = false;
+    layer = 0;
+    layersFull = false;
+    work = 0;
+    buckets.Clear();
+    size_t rows = size_t(areaDev.ymax - areaDev.ymin);
+    if (areaDev.xmax <= areaDev.xmin || !buckets.Reserve(rows))
+        return;
+    for (size_t i = 0; i < rows; ++i)
+        buckets.Push(nullptr);
+}
+
+void CRaster::AddEdges(REdge* edges)
+{
+    if (buckets.size() == 0 || !edges)
+        return;
+    needsSort = true;
+    for (REdge* e = edges; e; e = e->next) {
+        if (e->anchor1y >= areaDev.ymax || e->anchor2y <= areaDev.ymin ||
+            e->anchor1y >= e->anchor2y)
+            continue;
+        REdge*& bucket = buckets[size_t(std::max(0, e->anchor1y - areaDev.ymin))];
+        e->nextObj = bucket;
+        bucket = e;
+    }
+}
+
+// The layer number has 16 bits; what does not fit above the others is not painted.
+void CRaster::AddEdges(REdge* edges, RColor* colors, RColor* clip)
+{
+    if (layersFull)
+        return;
+    AddEdges(edges);
+    for (RColor* c = colors; c; c = c->nextColor) {
+        c->order = (c->order & 0xFFFF) | layer;
+        c->clipColor = c == clip ? nullptr : clip;
+        c->visible = 0;
+        c->nextActive = nullptr;
+        c->pixValid = 0;
+        c->spanRow = 0;
+    }
+    layer += 0x10000;
+    layersFull = layer == 0;
+}
+
+void CRaster::SetYCoord(S32 row)
+{
+    rowY = row;
+    rowBits = output->RowAddr(row);
+}
+
+void CRaster::ClearArea()
+{
+    for (S32 row = area.ymin; row < area.ymax; ++row)
+        ops->fillRow(output->RowAddr(row), area.xmin, ops->pack(RGBI()), area.xmax - area.xmin);
+}
+
+void CRaster::PaintBits()
+{
+    if (!BitsValid() || buckets.size() == 0)
+        return;
+    if (alphaOutput)
+        ClearArea();
+    for (y = areaDev.ymin; y < areaDev.ymax && work < kMaxWork; ++y) {
+        if (antialias && (y & 3) == 0)
+            BeginRow();
+        AddActive();
+        SortActive();
+        if (!antialias)
+            SetYCoord(y);
+        PaintActive();
+        if (antialias)
+            EndSubline();
+        if (antialias && (y & 3) == 3)
+            PaintAARuns();
+    }
+    ClearStack();
+    FreeActive();
+}
+
+// The output is in memory: there is nothing to hand over.
+void CRaster::Flush() {}
+
+void CRaster::FreeEmpties()
+{
+    activeAlloc.FreeEmpties();
+    rampAlloc.FreeEmpties();
+}
+
+U32* CRaster::AllocRamp()
+{
+    return static_cast<U32*>(rampAlloc.Alloc());
+}
+
+void CRaster::FreeRamp(U32* ramp)
+{
+    rampAlloc.Free(ramp);
+}

@@ -1,0 +1,104 @@
+// Life of a colour: set up, its cache, and the procedures of solid and clip colours.
+#include "core/raster/rcolor.h"
+
+#include <cstring>
+
+#include "core/raster/gradient.h"
+#include "core/raster/raster.h"
+
+static void DrawNothing(RColor*, S32, S32) {}
+
+static void BuildNothing(RColor*, S32, S32, RGBI*) {}
+
+static void DrawSolidSlab(RColor* color, S32 x0, S32 x1)
+{
+    CRaster* raster = color->raster;
+    raster->Ops()->fillRow(raster->RowBits(), x0, color->rgbPixel, x1 - x0);
+}
+
+static void BuildSolidSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
+{
+    for (S32 i = 0, n = x1 - x0; i < n; ++i)
+        dst[i] = color->rgb;
+}
+
+static void CompositeSolidSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
+{
+    CompositeRGBSolid(&color->rgb, dst, x1 - x0);
+}
+
+void CompositeRGB(const RGBI* src, RGBI* dst, int n)
+{
+    for (int i = 0; i < n; ++i)
+        dst[i] = FromLanes(BlendLanes(ToLanes(dst[i]), ToLanes(src[i])));
+}
+
+void CompositeRGBSolid(const RGBI* c, RGBI* dst, int n)
+{
+    Lanes src = ToLanes(*c);
+    U32 rest = 256 - LaneAlpha(src);
+    for (int i = 0; i < n; ++i)
+        dst[i] = FromLanes((ToLanes(dst[i]) * rest >> 8 & kLaneMask) + src);
+}
+
+void CalcSolidPixel(RColor* color, S32, RGBI* dst)
+{
+    *dst = color->rgb;
+}
+
+// Bitmap fills keep their solid fallback until images are decoded.
+void CalcBitmapPixel(RColor* color, S32, RGBI* dst)
+{
+    *dst = color->rgb;
+}
+
+void RColor::SetUp(CRaster* r)
+{
+    std::memset(static_cast<void*>(this), 0, sizeof *this);
+    raster = r;
+    colorType = kColorSolid;
+    drawSlabProc = DrawNothing;
+    buildSlabProc = BuildNothing;
+    cxform.Clear();
+}
+
+void RColor::BuildCache()
+{
+    pixValid = 0;
+    cached = 1;
+    if (!raster)
+        return;
+    if (colorType == kColorGradient) {
+        BuildGradientCache(this);
+    } else if (colorType == kColorSolid) {
+        rgbPixel = raster->Ops()->pack(rgb);
+        drawSlabProc = DrawSolidSlab;
+        buildSlabProc = transparent ? CompositeSolidSlab : BuildSolidSlab;
+    }
+}
+
+void RColor::FreeCache()
+{
+    if (!cached)
+        return;
+    cached = 0;
+    pixValid = 0;
+    drawSlabProc = DrawNothing;
+    buildSlabProc = BuildNothing;
+    if (builtRamp)
+        raster->FreeRamp(builtRamp);
+    builtRamp = nullptr;
+}
+
+RColor* ClipMarker()
+{
+    static RColor marker = [] {
+        RColor c;
+        c.SetUp(nullptr);
+        c.colorType = kColorClip;
+        c.transparent = 1;
+        c.visible = 1;
+        return c;
+    }();
+    return &marker;
+}
