@@ -36,7 +36,7 @@ struct MenuStatus {
 
 // A shell subclasses this as NativePlayerWnd and calls everything from one thread. Virtual
 // operations are what the core asks of the shell; none may call back into the player unless its
-// contract says so.
+// contract says so. The shell's destructor calls ClearScript, while its operations still exist.
 class SPlayer : public ScriptPlayer {
 public:
     DisplayList scene;              // the display list; `display` of every thread points here
@@ -133,6 +133,10 @@ public:
 
 private:
     void AdvanceThreads();
+    void AdjustQuality(S32 elapsed, S32 framesPlayed);
+    ScriptPlayer* NewLayer(S32 layer);
+    bool CreateBits(const SRECT* client);
+    void TakeDirty();
     void BlitPending();
     void ChooseCamera();
 };

@@ -1,0 +1,95 @@
+// Levels: the movies beside the root.
+#include "core/player/limits.h"
+#include "core/player/player.h"
+#include "core/stream/str.h"
+
+#include <new>
+
+namespace {
+
+U32 CountLayers(const ScriptPlayer* first)
+{
+    U32 n = 0;
+    for (; first != nullptr; first = first->nextLayer)
+        n++;
+    return n;
+}
+
+} // namespace
+
+ScriptPlayer* FindLayer(ScriptPlayer* first, S32 layer)
+{
+    while (first != nullptr && first->layerNum != layer)
+        first = first->nextLayer;
+    return first;
+}
+
+S32 LayerNum(const char* name)
+{
+    if (name == nullptr)
+        return -1;
+    const char* digits = SkipPrefix(name, "_vexel");
+    if (digits == nullptr)
+        digits = SkipPrefix(name, "_level");
+    return digits == nullptr ? -1 : ToInt(digits);
+}
+
+ScriptPlayer* SPlayer::OpenLayer(S32 layer, int keep)
+{
+    ScriptPlayer* movie = this;
+    if (layer != 0) {
+        movie = FindLayer(layers, layer);
+        if (movie == nullptr)
+            movie = NewLayer(layer);
+        else if (!keep)
+            movie->ClearScript();
+    } else if (!keep && (headerBytes > 0 || stream != nullptr)) {
+        ClearScript();
+    }
+    if (movie != nullptr)
+        SetVersionVariable(movie);
+    return movie;
+}
+
+ScriptPlayer* SPlayer::NewLayer(S32 layer)
+{
+    if (layer < 0 || CountLayers(layers) >= gLimits.loadedMovies)
+        return nullptr;
+    ScriptPlayer* movie = new (std::nothrow) ScriptPlayer;
+    if (movie == nullptr)
+        return nullptr;
+    movie->splayer = this;
+    movie->display = &scene;
+    movie->layerNum = layer;
+    movie->layerDepth = static_cast<U16>(layer);
+    movie->nextLayer = layers;
+    layers = movie;
+    scene.AddThread(movie);
+    return movie;
+}
+
+void SPlayer::ClearLayer(S32 layer)
+{
+    if (layer == 0) {
+        ClearScript();
+        return;
+    }
+    for (ScriptPlayer** link = &layers; *link != nullptr; link = &(*link)->nextLayer) {
+        ScriptPlayer* movie = *link;
+        if (movie->layerNum != layer)
+            continue;
+        *link = movie->nextLayer;
+        delete movie;
+        return;
+    }
+}
+
+void SPlayer::FreeLayers()
+{
+    while (layers != nullptr) {
+        ScriptPlayer* movie = layers;
+        layers = movie->nextLayer;
+        delete movie;
+    }
+    ScriptPlayer::ClearScript();
+}

@@ -1,0 +1,142 @@
+#include "platform/headless/native_player.h"
+
+namespace {
+
+S64 gClock = 0; // microseconds
+
+constexpr size_t kLargestBlock = size_t(1) << 30;
+
+// Twips to whole pixels toward zero; nothing below zero, and no wider than a picture could be asked
+// for by number.
+S32 PixelsOf(S32 low, S32 high)
+{
+    const S64 pixels = (static_cast<S64>(high) - low) / 20;
+    return pixels < 0 ? 0 : static_cast<S32>(pixels);
+}
+
+} // namespace
+
+S64 real_time_clock_usecs()
+{
+    return gClock;
+}
+
+void SetHeadlessClock(S64 usecs)
+{
+    gClock = usecs;
+}
+
+void AdvanceHeadlessClock(S64 usecs)
+{
+    gClock += usecs;
+}
+
+NativePlayerWnd::NativePlayerWnd(S32 pixelWidth, S32 pixelHeight)
+    : width(pixelWidth < 0 ? 0 : pixelWidth), height(pixelHeight < 0 ? 0 : pixelHeight),
+      ownSize(pixelWidth == 0 && pixelHeight == 0)
+{
+    RectSetEmpty(&blitted);
+    RectSetEmpty(&invalidated);
+}
+
+NativePlayerWnd::~NativePlayerWnd()
+{
+    ClearScript();
+}
+
+void NativePlayerWnd::Feed(const U8* data, size_t n)
+{
+    while (n > 0) {
+        const size_t block = n < kLargestBlock ? n : kLargestBlock;
+        PushDataBuf(data, static_cast<S32>(block));
+        if (gotHeader && !sizeReported) {
+            sizeReported = true;
+            AdjustWindow(PixelsOf(frame.xmin, frame.xmax), PixelsOf(frame.ymin, frame.ymax));
+        }
+        PushDataComplete();
+        data += block;
+        n -= block;
+    }
+}
+
+void NativePlayerWnd::EndOfData()
+{
+    SetDataComplete();
+}
+
+bool NativePlayerWnd::CanTick() const
+{
+    if (!Started())
+        return false;
+    return !playing || Complete() || FrameAvailable(curFrame + 1);
+}
+
+void NativePlayerWnd::Tick()
+{
+    AdvanceHeadlessClock(static_cast<S64>(frameDelay) * 1000);
+    DoPlay(1);
+}
+
+const CBitBuffer* NativePlayerWnd::Picture()
+{
+    OnDraw();
+    return bits.HasBits() ? &bits : nullptr;
+}
+
+void NativePlayerWnd::OverrideBackground(SRGB color)
+{
+    constexpr int kShellPriority = 2; // above what a movie can ask for; survives a reset
+    const int current = scene.backgroundPriority;
+    const int priority = current < kShellPriority ? kShellPriority : current + 1;
+    scene.SetBackgroundColor(color.alpha == 0 ? SRGB{} : color, priority);
+}
+
+bool NativePlayerWnd::StartTimer(S32 interval, S32)
+{
+    timerRuns = true;
+    timerInterval = interval;
+    return true;
+}
+
+void NativePlayerWnd::StopTimer()
+{
+    timerRuns = false;
+}
+
+void NativePlayerWnd::InvalidateScreenArea(const SRECT* r)
+{
+    RectUnion(&invalidated, r, &invalidated);
+}
+
+void NativePlayerWnd::ClientRect(SRECT* r)
+{
+    *r = {0, width, 0, height};
+}
+
+void NativePlayerWnd::AdjustWindow(S32 pixelWidth, S32 pixelHeight)
+{
+    if (!ownSize)
+        return;
+    width = pixelWidth;
+    height = pixelHeight;
+    FreeBuffer();
+}
+
+void NativePlayerWnd::BltToScreen(const SRECT* r)
+{
+    RectUnion(&blitted, r, &blitted);
+}
+
+void NativePlayerWnd::ClearScreen() {}
+
+void NativePlayerWnd::StreamPostURLNotify(const char*, const char*, U32, const char*, void*) {}
+
+void NativePlayerWnd::StreamGetURLNotify(const char*, const char*, void*) {}
+
+void NativePlayerWnd::CloseStream(StreamData*) {}
+
+void NativePlayerWnd::ProcessFSCommand(const char*, const char*) {}
+
+void NativePlayerWnd::EnableMenus(const MenuStatus&) {}
+
+void NativePlayerWnd::UpdateCursor() {}
