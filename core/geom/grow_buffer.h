@@ -2,12 +2,13 @@
 #pragma once
 
 #include <cstdlib>
+#include <cstring>
 #include <type_traits>
 
 #include "core/geom/types.h"
 
 // Elements are moved by realloc and never constructed or destroyed. Pointers into the buffer hold
-// until the next Reserve or Push.
+// until the next Reserve, Push or Resize.
 template <typename T> class GrowBuffer {
     static_assert(std::is_trivially_copyable_v<T>);
 
@@ -44,6 +45,18 @@ public:
         return true;
     }
 
+    // Makes the size n; elements gained are zero bytes. False, with nothing changed, when the heap
+    // is exhausted.
+    bool Resize(size_t n)
+    {
+        if (!Reserve(n))
+            return false;
+        if (n > count)
+            std::memset(static_cast<void*>(items + count), 0, (n - count) * sizeof(T));
+        count = n;
+        return true;
+    }
+
     // Drops all elements past the first n.
     void Truncate(size_t n) { count = n < count ? n : count; }
     // Drops all elements and keeps the memory.
@@ -54,6 +67,13 @@ public:
     size_t size() const { return count; }
     T& operator[](size_t i) { return items[i]; }
     const T& operator[](size_t i) const { return items[i]; }
+    // The last element; there must be one.
+    T& Back() { return items[count - 1]; }
+    const T& Back() const { return items[count - 1]; }
+    T* begin() { return items; }
+    T* end() { return items + count; }
+    const T* begin() const { return items; }
+    const T* end() const { return items + count; }
 
 private:
     static constexpr size_t kMaxItems = (static_cast<size_t>(-1) / 2) / sizeof(T);
