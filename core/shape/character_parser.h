@@ -33,11 +33,12 @@ public:
 private:
     void Walk();
     void ChangeFills();
-    void AddSplit(const CURVE* first, const CURVE* second);
-    bool SplitAtExtremum(const CURVE* c, CURVE* oriented);
-    bool GuardHuge(const CURVE* incoming, CURVE* oriented);
-    void AddPiece(const CURVE* oriented, S8 dir);
+    void SplitAtTurn(const CURVE& c);
+    void SplitAtMiddle(const CURVE& c);
+    void AddHalves(const CURVE& first, const CURVE& second);
+    void AddPiece(CURVE* c);
 
+    bool edgesLost = false;      // the edge pool is exhausted: nothing is split any more
     RColor* clipColor = nullptr; // of the whole mask, made once
 };
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "core/geom/curve.h"
+#include "core/geom/grow_buffer.h"
 #include "core/geom/matrix.h"
 #include "core/raster/raster.h"
 #include "core/stream/parser.h"
@@ -51,9 +52,9 @@ public:
     SPOINT curPtX;         // pen, device coordinates
 
     // Reads `dataLen` bytes at `data` from `start`. `list` is the head that colours are pushed on.
+    // `player` may be null: bitmap ids then resolve to nothing.
     SShapeParser(ScriptPlayer* player, DisplayList* display, RColor** list, const U8* data,
                  S32 dataLen, S32 start, const MATRIX* mat);
-    ~SShapeParser();
     SShapeParser(const SShapeParser&) = delete;
     SShapeParser& operator=(const SShapeParser&) = delete;
 
@@ -75,33 +76,42 @@ public:
     void SetOnlyFill(RColor* color);
 
     // Finishes a colour whose kind and parameters are filled in: its inverse matrices and its
-    // cache.
+    // cache. Without a raster the colour stays as it is and is never drawn.
     void SetupColor(RColor* color);
 
 private:
     static constexpr U32 kInlineStyles = 256;
 
-    bool ReadStyleBlock(bool morph);
-    bool ReadFills(bool morph);
-    bool ReadLines(bool morph);
-    U32 ReadCount(bool* escaped);
+    // shape_styles.cpp
+    bool ReadStyleBlock();
+    bool ReadFills();
+    bool ReadLines();
+    U32 ReadCount();
     bool SizeFills(U32 count);
     bool SizeLines(U32 count);
     RColor* NewColor(U32 number);
-    void ReadFill(RColor* color, bool morph);
-    void ReadGradient(RColor* color, U8 type, bool morph);
-    void ReadRamp(RColor* color, bool morph);
-    void ReadBitmapFill(RColor* color, U8 type, bool morph);
-    void ReadSolid(RColor* color, bool morph);
-    void ReadFillMatrix(MATRIX* m, bool morph);
+    void ReadFill(RColor* color);
+    void ReadGradient(RColor* color, U8 type);
+    void ReadRamp(RColor* color);
+    void ReadStop(U8* stopRatio, SRGB* stopColor);
+    void ReadBitmapFill(RColor* color, U8 type);
+    void ReadSolid(RColor* color);
+    U16 ReadWidth();
+    void ReadFillMatrix(MATRIX* m);
     void FinishSolid(RColor* color);
-    void ReadStraight(CURVE* c);
-    void ReadCurved(CURVE* c);
-    int ReadStyleChange(int flags);
 
-    bool morphStyles = false; // new styles inside the records are morph style blocks
+    // shape_parser.cpp
+    template <typename Bits> void ReadEdge(Bits& bits, CURVE* c);
+    void SetPen(const SPOINT& pen);
+    int ReadStyleChange();
+
+    void InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const;
+
+    bool morphStyles = false; // styles are pairs, also where they are renewed inside the records
+    // The tables stay as they are until a count sizes them: clearing them would cost more than
+    // reading a small shape.
     RColor* inlineFills[kInlineStyles];
     SLineStyle inlineLines[kInlineStyles];
-    RColor** heapFills = nullptr;
-    SLineStyle* heapLines = nullptr;
+    GrowBuffer<RColor*> heapFills; // in place of the inline tables when they are too small
+    GrowBuffer<SLineStyle> heapLines;
 };

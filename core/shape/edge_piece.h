@@ -1,0 +1,35 @@
+// The last step before the raster: a monotonic curve becomes an edge, or is found not to fit one.
+#pragma once
+
+#include "core/geom/curve.h"
+#include "core/raster/edge.h"
+
+class DisplayList;
+
+// Coordinates that the builders let into an edge without a second look, and how far from the
+// origin a shape can still show.
+constexpr S32 kEdgeReach = 32000;
+constexpr S32 kShownReach = 16000;
+
+enum EPieceFate {
+    kPieceKeep,  // fits an edge now, cut to its 16 bits where that had to be
+    kPieceDrop,  // cannot show
+    kPieceSplit, // to be halved
+};
+
+// True when the three points lie within kEdgeReach of both axes.
+inline bool PieceFits(const CURVE& c)
+{
+    const auto inside = [](S32 v) { return U32(v) + U32(kEdgeReach) <= U32(2 * kEdgeReach); };
+    return inside(c.anchor1.x) & inside(c.anchor1.y) & inside(c.control.x) & inside(c.control.y) &
+           inside(c.anchor2.x) & inside(c.anchor2.y);
+}
+
+// Decides about a y-monotonic piece that may not fit. One that lies wholly left or right of all
+// that shows becomes a vertical line on that side, so that the fills between still begin and end
+// on its scanlines. With `mayHalve` false kPieceSplit is never the answer.
+EPieceFate GuardPiece(CURVE* c, bool mayHalve);
+
+// Makes an edge of a y-monotonic piece that fits and pushes it on `list`; fill rule and colours
+// are left to the caller. Null when the pool is exhausted. The piece must not be level.
+REdge* PushEdge(DisplayList* display, REdge** list, const CURVE& c);
