@@ -4,14 +4,8 @@
 #include "core/geom/trig.h"
 
 namespace {
-// Differences between clamped coordinates keep the products of two of them within 62 bits.
+// Differences up to here have products whose sum fits into 62 bits.
 constexpr S64 kDiffLimit = S64{1} << 30;
-
-S64 ClampedDiff(S32 a, S32 b)
-{
-    const S64 diff = static_cast<S64>(a) - b;
-    return diff > kDiffLimit ? kDiffLimit : diff < -kDiffLimit ? -kDiffLimit : diff;
-}
 
 bool Within(S32 a, S32 b, S32 tol)
 {
@@ -30,11 +24,20 @@ struct Foot {
     S64 den; // 0 when a and b coincide
 };
 
+bool IsLong(S64 diff)
+{
+    return diff > kDiffLimit || diff < -kDiffLimit;
+}
+
 Foot FootOnLine(const SPOINT* p, const SPOINT* a, const SPOINT* b)
 {
-    const S64 dx = ClampedDiff(b->x, a->x);
-    const S64 dy = ClampedDiff(b->y, a->y);
-    return {ClampedDiff(p->x, a->x) * dx + ClampedDiff(p->y, a->y) * dy, dx * dx + dy * dy};
+    S64 diffs[] = {static_cast<S64>(p->x) - a->x, static_cast<S64>(p->y) - a->y,
+                   static_cast<S64>(b->x) - a->x, static_cast<S64>(b->y) - a->y};
+    const auto& [px, py, dx, dy] = diffs;
+    if (IsLong(px) || IsLong(py) || IsLong(dx) || IsLong(dy))
+        for (S64& diff : diffs)
+            diff >>= 2; // the fraction hardly changes
+    return {px * dx + py * dy, dx * dx + dy * dy};
 }
 
 SPOINT PointAtFoot(const Foot& foot, const SPOINT* a, const SPOINT* b)
