@@ -26,11 +26,6 @@ struct CURVE_STEPPER {
     S64 x, y;     // position
 };
 
-inline S32 MiddleOf(S32 a, S32 b)
-{
-    return static_cast<S32>((static_cast<S64>(a) + b) >> 1);
-}
-
 inline void PointMiddle(const SPOINT* p, const SPOINT* q, SPOINT* dst)
 {
     *dst = {MiddleOf(p->x, q->x), MiddleOf(p->y, q->y)};

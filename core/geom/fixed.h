@@ -47,6 +47,19 @@ inline S32 FixedLerp(S32 a, S32 b, S32 t)
     return static_cast<S32>(a + (((static_cast<S64>(b) - a) * t) >> 16));
 }
 
+// (a + b) / 2 rounded down, the sum taken in 64 bits.
+inline S32 MiddleOf(S32 a, S32 b)
+{
+    return static_cast<S32>((static_cast<S64>(a) + b) >> 1);
+}
+
+// True when a and b differ by at most tol; the difference does not wrap.
+inline bool IsWithin(S32 a, S32 b, S32 tol)
+{
+    const S64 diff = static_cast<S64>(a) - b;
+    return diff <= tol && -diff <= tol;
+}
+
 // v rounded to the nearest multiple of m, halves away from zero. v itself when m is 0.
 inline S32 FixedNearestMultiple(S32 v, S32 m)
 {

@@ -7,17 +7,6 @@ constexpr S32 kOne = 0x10000;
 constexpr S32 kHalfSqrt2 = 46341; // 1/sqrt(2)
 constexpr S32 kSkewTolerance = 16;
 
-bool Within(S32 a, S32 b, S32 tol)
-{
-    const S64 diff = static_cast<S64>(a) - b;
-    return diff <= tol && -diff <= tol;
-}
-
-S32 Middle(S32 a, S32 b)
-{
-    return static_cast<S32>((static_cast<S64>(a) + b) >> 1);
-}
-
 S32 AtLeastOne(S32 v)
 {
     return v < 1 ? 1 : v;
@@ -92,14 +81,15 @@ bool MatrixIsIdentity(const MATRIX* m)
 
 bool MatrixIsScaleOnly(const MATRIX* m)
 {
-    return Within(m->b, 0, kSkewTolerance) && Within(m->c, 0, kSkewTolerance) && m->a > 0 &&
+    return IsWithin(m->b, 0, kSkewTolerance) && IsWithin(m->c, 0, kSkewTolerance) && m->a > 0 &&
            m->d > 0;
 }
 
 bool MatrixEqual(const MATRIX* m1, const MATRIX* m2, S32 tol)
 {
-    return Within(m1->a, m2->a, tol) && Within(m1->b, m2->b, tol) && Within(m1->c, m2->c, tol) &&
-           Within(m1->d, m2->d, tol) && Within(m1->tx, m2->tx, tol) && Within(m1->ty, m2->ty, tol);
+    return IsWithin(m1->a, m2->a, tol) && IsWithin(m1->b, m2->b, tol) &&
+           IsWithin(m1->c, m2->c, tol) && IsWithin(m1->d, m2->d, tol) &&
+           IsWithin(m1->tx, m2->tx, tol) && IsWithin(m1->ty, m2->ty, tol);
 }
 
 void MatrixTransformRect(const MATRIX* m, const SRECT* r, SRECT* dst)
@@ -170,8 +160,8 @@ void MatrixMapAspect(const SRECT* src, const SRECT* dst, MATRIX* m)
 {
     MatrixMap(src, dst, m);
     const S32 s = m->a < m->d ? m->a : m->d;
-    const S32 tx = Middle(dst->xmin, dst->xmax) - FixedMul(Middle(src->xmin, src->xmax), s);
-    const S32 ty = Middle(dst->ymin, dst->ymax) - FixedMul(Middle(src->ymin, src->ymax), s);
+    const S32 tx = MiddleOf(dst->xmin, dst->xmax) - FixedMul(MiddleOf(src->xmin, src->xmax), s);
+    const S32 ty = MiddleOf(dst->ymin, dst->ymax) - FixedMul(MiddleOf(src->ymin, src->ymax), s);
     *m = {s, 0, 0, s, tx, ty};
 }
 

@@ -7,12 +7,6 @@ namespace {
 // Differences up to here have products whose sum fits into 62 bits.
 constexpr S64 kDiffLimit = S64{1} << 30;
 
-bool Within(S32 a, S32 b, S32 tol)
-{
-    const S64 diff = static_cast<S64>(a) - b;
-    return diff <= tol && -diff <= tol;
-}
-
 SPOINT Minus(const SPOINT* p, const SPOINT* origin)
 {
     return {p->x - origin->x, p->y - origin->y};
@@ -51,7 +45,7 @@ SPOINT PointAtFoot(const Foot& foot, const SPOINT* a, const SPOINT* b)
 
 bool PointEqual(const SPOINT* p1, const SPOINT* p2, S32 tol)
 {
-    return Within(p1->x, p2->x, tol) && Within(p1->y, p2->y, tol);
+    return IsWithin(p1->x, p2->x, tol) && IsWithin(p1->y, p2->y, tol);
 }
 
 S32 ShiftRounded(S32 v, int n)

@@ -11,17 +11,6 @@ S32 Max(S32 a, S32 b)
     return a > b ? a : b;
 }
 
-bool Within(S32 a, S32 b, S32 tol)
-{
-    const S64 diff = static_cast<S64>(a) - b;
-    return diff <= tol && -diff <= tol;
-}
-
-S32 Middle(S32 a, S32 b)
-{
-    return static_cast<S32>((static_cast<S64>(a) + b) >> 1);
-}
-
 // Distance between two ranges on one axis, 0 when they touch.
 U32 Gap(S32 min1, S32 max1, S32 min2, S32 max2)
 {
@@ -131,14 +120,14 @@ bool RectEqual(const SRECT* a, const SRECT* b, S32 tol)
 {
     if (RectIsEmpty(a) || RectIsEmpty(b))
         return RectIsEmpty(a) && RectIsEmpty(b);
-    return Within(a->xmin, b->xmin, tol) && Within(a->xmax, b->xmax, tol) &&
-           Within(a->ymin, b->ymin, tol) && Within(a->ymax, b->ymax, tol);
+    return IsWithin(a->xmin, b->xmin, tol) && IsWithin(a->xmax, b->xmax, tol) &&
+           IsWithin(a->ymin, b->ymin, tol) && IsWithin(a->ymax, b->ymax, tol);
 }
 
 void RectGetPoint(const SRECT* r, int i, SPOINT* p)
 {
-    const S32 mx = Middle(r->xmin, r->xmax);
-    const S32 my = Middle(r->ymin, r->ymax);
+    const S32 mx = MiddleOf(r->xmin, r->xmax);
+    const S32 my = MiddleOf(r->ymin, r->ymax);
     const SPOINT handles[] = {{r->xmin, r->ymax}, {r->xmax, r->ymax}, {r->xmax, r->ymin},
                               {r->xmin, r->ymin}, {mx, r->ymax},      {r->xmax, my},
                               {mx, r->ymin},      {r->xmin, my},      {mx, my}};
