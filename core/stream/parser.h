@@ -50,7 +50,9 @@ public:
 
     // The string at `pos`, owned by the data; `pos` moves past its zero byte.
     const char* GetStringP();
-    // The same as a heap copy, freed by the caller with FreeStr.
+    // The string at `pos`, without moving.
+    const char* PeekString() const;
+    // GetStringP's as a heap copy, freed by the caller with FreeStr.
     char* GetString();
 
     // Copies min(n, bytes left in the tag) bytes to dst and returns how many.
@@ -67,4 +69,12 @@ public:
 protected:
     SParser() = default;
     ~SParser() = default;
+
+private:
+    S32 Incomplete();
+};
+
+// A reader of its own for looking through tags without disturbing the timeline that owns them.
+struct STagWalker : SParser {
+    STagWalker(const SParser& source, S32 start) { Attach(source.script, source.limit, start); }
 };

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/geom/chunk_alloc.h"
+#include "core/geom/grow_buffer.h"
 #include "core/geom/rect.h"
 #include "core/stream/character.h"
 #include "core/stream/script_thread.h"
@@ -14,7 +15,9 @@ enum SScriptError : S32 { kErrNone = 0, kErrBadHeader = -1, kErrNoMemory = -2 };
 
 // The movie buffer is allocated once at the declared length, zeroed, with one zero byte more, and
 // never moves: names, labels and character bodies point into it. Blocks of any size are pushed as
-// they arrive; the result does not depend on how they were cut. Player thread only.
+// they arrive. How they were cut makes no difference, with one exception: the header is read when
+// 21 bytes are there, and of a frame rectangle wider than 9 bytes what is then still missing reads
+// as 0. Player thread only.
 class ScriptPlayer : public ScriptThread {
 public:
     // numFramesComplete of a movie that is all there.
@@ -24,8 +27,8 @@ public:
     ScriptPlayer* nextLayer = nullptr; // link of the player's levels
     char* sourceName = nullptr;        // owned; where the movie came from
     S32 scriptLen = -1;                // declared length; -1 while the header has not arrived
-    S32* sharedScript = nullptr; // holders of the buffer, when it is shared with other loaders
-    S32 headerBytes = 0;         // of the first 8 bytes, how many have arrived
+    S32* sharedScript = nullptr;       // holders of the buffer when loaders share it; made by new
+    S32 headerBytes = 0;               // of the first 8 bytes, how many have arrived
     U8 header[8] = {};
     bool gotHeader = false;     // frame rectangle, rate and count are known
     S32 numFramesComplete = -1; // index of the last frame that is all there; kAllFrames at the end
@@ -62,9 +65,11 @@ public:
     SCharacter* CreateCharacter(U16 id);
     SCharacter* FindCharacter(U16 id);
     void FreeCharacter(U16 id);
-    // Frees an entry that is out of the dictionary already, now or with its last user.
+    // Frees an entry of this movie that is out of the dictionary already, now or with its last
+    // user.
     void FreeCharacter(SCharacter* ch);
-    // A zeroed record that belongs to one object and is in no dictionary.
+    // A zeroed record of type kCharNone that is in no dictionary; its last ReleaseCharacter frees
+    // it. Null when memory is exhausted.
     SCharacter* NewPrivateCharacter();
 
     // All bytes are there.
@@ -85,16 +90,21 @@ public:
     ChunkAlloc charAlloc;
 
 private:
+    friend void ReleaseCharacter(SCharacter* ch);
+
     bool CollectHeader(const U8*& data, S32& n);
+    S32 StartMovie();
     void ParseHeader();
     void CountCompleteFrames();
     void ReleaseBuffer();
     void PushVariables(const U8* data, S32 n);
     void DestroyCharacter(SCharacter* ch);
+    void ReleaseOrphan(SCharacter* ch);
+    void RemoveStrays();
 
-    U8* varsData = nullptr; // bytes of a variables stream
-    size_t varsLen = 0;
-    size_t varsCapacity = 0;
+    GrowBuffer<U8> varsData; // bytes of a variables stream
+    U32 characterCount = 0;  // records of the pool in use
+    U32 orphanCount = 0;     // of these, out of the dictionary
 };
 
 // A user of a character's record: a pointer that must stay valid.

@@ -5,6 +5,7 @@
 #include "core/stream/parser.h"
 
 class DisplayList;
+struct PlaceInfo;
 class SPlayer;
 class ScriptPlayer;
 struct SCharacter;
@@ -29,17 +30,18 @@ enum SDrawResult : S32 { kDrawn = 0, kNeedsData = 1, kAtEnd = 2, kDrawFailed = -
 class ScriptThread : public SParser {
 public:
     ScriptPlayer* player = nullptr;     // the movie whose dictionary this timeline uses
-    ScriptThread* nextThread = nullptr; // link of the display list's threads
-    SPlayer* splayer = nullptr;         // the player
-    S32 startPos = 0;                   // first tag
-    S32 len = 0;                        // tags may be read up to here
-    bool atEnd = false;                 // the End tag has run
-    S32 curFrame = -1;                  // last frame whose ShowFrame has run
-    bool seeking = false;               // tags run only to rebuild state: no actions, no sounds
-    bool soundResync = true;            // set by Play and by every seek, for the streaming sound
-    bool soundHold = false;             // the streaming sound's own
-    bool playing = true;                // advances on each tick
-    bool loop = true;                   // goes back to frame 0 at the end
+    ScriptThread* nextThread = nullptr; // links of the display list's threads
+    ScriptThread* prevThread = nullptr;
+    SPlayer* splayer = nullptr; // the player
+    S32 startPos = 0;           // first tag
+    S32 len = 0;                // tags may be read up to here
+    bool atEnd = false;         // the End tag has run
+    S32 curFrame = -1;          // last frame whose ShowFrame has run
+    bool seeking = false;       // tags run only to rebuild state: no actions, no sounds
+    bool soundResync = true;    // set by Play and by every seek, for the streaming sound
+    bool soundHold = false;     // the streaming sound's own
+    bool playing = true;        // advances on each tick
+    bool loop = true;           // goes back to frame 0 at the end
     S32 numFrames = 0;
     S32 scriptErr = 0;              // 0, or the loader's error: -1 bad header, -2 out of memory
     U16 layerDepth = 0;             // depth of rootObject in its parent
@@ -94,17 +96,22 @@ public:
     // This thread is its movie's root timeline.
     bool IsRoot() const;
 
+protected:
+    // Back to the first tag; what has been placed stays.
+    void Rewind();
+
 private:
     void Dispatch();
-    void Rewind();
+    void DispatchDefinition();
     bool MakeRootObject();
     S32 SeekBack(S32 frame);
-    void SeekForward(S32 frame);
+    void RunSilently(S32 frame);
     void StopSound();
 
     // tag handlers
     void PlaceObject();
     void PlaceObject2();
+    void PlaceOrMove(const PlaceInfo& info);
     void RemoveObject();
     void SetBackgroundColor();
     void DefineShape();
@@ -119,12 +126,20 @@ private:
     void DefineSprite();
     void DefineFontInfo();
     void DefineButtonExtra();
+    void FreeCharacter();
     // Reads the id and enters a character of that type; null (and the tag is ignored) when the id
     // is taken or reserved.
     SCharacter* NewCharacter(U8 type);
     // The body of `ch` continues at `pos`.
     void KeepBody(SCharacter* ch);
     SCharacter* PlacedCharacter(U16 id);
+    SCharacter* DefinedCharacter(U8 type);
+    SCharacter* CopyMovieCharacter(const SCharacter* source);
+
+    SVariable* NewVariable(const char* name);
+    void IndexVariable(SVariable* var);
+    void AddToBucket(SVariable* var);
+    bool GrowIndex();
 
     SVariable** buckets = nullptr; // name index, grown with the list; null while the list is short
     U32 bucketCount = 0;

@@ -1,0 +1,92 @@
+#include "core/stream/str.h"
+
+#include <cstdlib>
+#include <cstring>
+
+#include "core/player/limits.h"
+
+namespace {
+// Stands before the characters of every string, so that the bytes alive can be counted exactly
+// whatever its owner writes into it.
+struct StrHead {
+    size_t bytes;
+};
+
+size_t liveBytes = 0;
+
+U8 Fold(char c)
+{
+    const U8 byte = static_cast<U8>(c);
+    return byte >= 'a' && byte <= 'z' ? static_cast<U8>(byte - ('a' - 'A')) : byte;
+}
+
+char* NewStr(const char* s, size_t n)
+{
+    const size_t bytes = n + 1;
+    if (bytes > gLimits.allStringBytes || liveBytes > gLimits.allStringBytes - bytes)
+        return nullptr;
+    auto* head = static_cast<StrHead*>(std::malloc(sizeof(StrHead) + bytes));
+    if (!head)
+        return nullptr;
+    head->bytes = bytes;
+    liveBytes += bytes;
+    char* copy = reinterpret_cast<char*>(head + 1);
+    std::memcpy(copy, s, n);
+    copy[n] = 0;
+    return copy;
+}
+} // namespace
+
+char* CreateStr(const char* s)
+{
+    return s ? NewStr(s, std::strlen(s)) : nullptr;
+}
+
+char* CreateStr(const char* s, int n)
+{
+    return s ? NewStr(s, n > 0 ? static_cast<size_t>(n) : 0) : nullptr;
+}
+
+void FreeStr(char* s)
+{
+    if (!s)
+        return;
+    StrHead* head = reinterpret_cast<StrHead*>(s) - 1;
+    liveBytes -= head->bytes;
+    std::free(head);
+}
+
+bool StrEqual(const char* a, const char* b)
+{
+    if (!a || !b)
+        return false;
+    const char* rest = SkipPrefix(a, b);
+    return rest && *rest == 0;
+}
+
+const char* SkipPrefix(const char* s, const char* prefix)
+{
+    if (!s || !prefix)
+        return nullptr;
+    for (; *prefix; s++, prefix++) {
+        if (Fold(*s) != Fold(*prefix))
+            return nullptr;
+    }
+    return s;
+}
+
+U32 StrHash(const char* s)
+{
+    U32 hash = 2166136261u;
+    for (; *s; s++)
+        hash = (hash ^ Fold(*s)) * 16777619u;
+    return hash;
+}
+
+S32 ToInt(const char* s)
+{
+    U32 value = 0;
+    for (; s && *s >= '0' && *s <= '9'; s++)
+        value = value * 10 + static_cast<U32>(*s - '0');
+    return static_cast<S32>(value);
+}

@@ -1,0 +1,125 @@
+// The variables of a timeline: a list in order of creation, with an index once it has grown.
+#include <cstdlib>
+#include <cstring>
+
+#include "core/player/limits.h"
+#include "core/stream/script_thread.h"
+#include "core/stream/str.h"
+
+namespace {
+// A list up to this length is searched from its head; beyond it the index is worth its memory.
+constexpr U32 kPlainList = 16;
+
+// The length of the text, or `most` when it is longer.
+size_t BoundedLength(const char* s, size_t most)
+{
+    const void* end = std::memchr(s, 0, most);
+    return end ? static_cast<size_t>(static_cast<const char*>(end) - s) : most;
+}
+
+char* CopyValue(const char* value)
+{
+    const size_t most = gLimits.stringBytes;
+    return value ? CreateStr(value, static_cast<int>(BoundedLength(value, most))) : nullptr;
+}
+} // namespace
+
+SVariable* ScriptThread::FindVariable(const char* name)
+{
+    if (!name)
+        return nullptr;
+    SVariable* var = vars;
+    if (!buckets) {
+        while (var && !StrEqual(var->name, name))
+            var = var->next;
+        return var;
+    }
+    const U32 hash = StrHash(name);
+    var = buckets[hash & (bucketCount - 1)];
+    while (var && (var->hash != hash || !StrEqual(var->name, name)))
+        var = var->nextInBucket;
+    return var;
+}
+
+void ScriptThread::SetVariable(const char* name, const char* value, int)
+{
+    SVariable* var = FindVariable(name);
+    if (!var)
+        var = NewVariable(name);
+    if (!var)
+        return;
+    // The value may be the variable's own string: copied before the old one goes.
+    char* copy = CopyValue(value);
+    FreeStr(var->value);
+    var->value = copy;
+}
+
+// Appended to the list; null when a limit or memory forbids it.
+SVariable* ScriptThread::NewVariable(const char* name)
+{
+    if (!name || variableCount >= gLimits.variables)
+        return nullptr;
+    const size_t most = size_t{gLimits.stringBytes} + 1;
+    const size_t nameLen = BoundedLength(name, most);
+    char* copy = nameLen < most ? CreateStr(name, static_cast<int>(nameLen)) : nullptr;
+    auto* var = copy ? static_cast<SVariable*>(std::calloc(1, sizeof(SVariable))) : nullptr;
+    if (!var) {
+        FreeStr(copy);
+        return nullptr;
+    }
+    var->name = copy;
+    var->hash = StrHash(copy);
+    (varsTail ? varsTail->next : vars) = var;
+    varsTail = var;
+    variableCount++;
+    IndexVariable(var);
+    return var;
+}
+
+void ScriptThread::IndexVariable(SVariable* var)
+{
+    const bool full = buckets ? variableCount > bucketCount : variableCount > kPlainList;
+    if (full && GrowIndex())
+        return;
+    if (buckets)
+        AddToBucket(var);
+}
+
+void ScriptThread::AddToBucket(SVariable* var)
+{
+    SVariable** bucket = &buckets[var->hash & (bucketCount - 1)];
+    var->nextInBucket = *bucket;
+    *bucket = var;
+}
+
+// Makes the index four times the size and enters every variable; false, and the old index stays,
+// when the heap is exhausted.
+bool ScriptThread::GrowIndex()
+{
+    const U32 count = (bucketCount ? bucketCount : kPlainList) * 4;
+    auto** grown = static_cast<SVariable**>(std::calloc(count, sizeof(SVariable*)));
+    if (!grown)
+        return false;
+    std::free(buckets);
+    buckets = grown;
+    bucketCount = count;
+    for (SVariable* var = vars; var; var = var->next)
+        AddToBucket(var);
+    return true;
+}
+
+void ScriptThread::ClearVariables()
+{
+    while (vars) {
+        SVariable* var = vars;
+        vars = var->next;
+        FreeStr(var->name);
+        FreeStr(var->value);
+        std::free(var);
+    }
+    varsTail = nullptr;
+    variableCount = 0;
+    std::free(buckets);
+    buckets = nullptr;
+    bucketCount = 0;
+}
