@@ -10,6 +10,7 @@
 #include "core/raster/raster.h"
 
 class CSoundMix;
+class ScriptPlayer;
 class ScriptThread;
 
 // Low four bits and alignment bits of a scale mode.
@@ -155,19 +156,29 @@ private:
     friend struct SObject;
 
     bool MayPlace(const SObject* parent, const SCharacter* character) const;
-    SObject** InsertionLink(SObject* parent, U16 depth);
+    SObject** FindLink(SObject* parent, U16 depth);
+    void SetPlacement(SObject* obj, SObject* parent, const PlaceInfo* info);
     void NameObject(SObject* obj, const PlaceInfo* info);
-    void StartTimeline(SObject* obj, const PlaceInfo* info);
+    void StartObject(SObject* obj, const PlaceInfo* info);
     void StartSprite(SObject* obj);
     void StartLoadedMovie(SObject* obj, const PlaceInfo* info);
+    void StartButton(SObject* obj);
     void AttachTimeline(SObject* obj, ScriptThread* thread);
+    ScriptPlayer* CloneMovie(const SCharacter* character);
+    void NoteMask(const SObject* mask);
+    void Discard(SObject* obj);
     bool KeepsOld(const SObject* old, const SObject* fresh) const;
     void TakeTransform(SObject* old, const SObject* fresh);
-    SObject** MergeHeld(SObject** link, SObject* old);
+    void KeepOld(SObject** freshLink);
+    SObject** MergeHeld(SObject** link);
     void DropHeld();
+    void InvalidateAll();
     void MakeDisjoint();
     void PaintBackground(RColor* color, REdge edges[2]);
     void PaintFocus(RColor* color, REdge** edges);
+    void FreeEdges(REdge* edges);
 
     U32 nextSerial = 1;
+    S32 openMasks = 0;    // masks whose range is being drawn now
+    U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
 };

@@ -50,6 +50,8 @@ struct SObject {
     EditText* editText;    // of a text field, owned
     U32 serial;            // never the same for two objects of one list: tells a recycled record
     U16 nesting;           // number of parents
+    U16 remaskFrom; // children of these depths were masked anew since the last recalculation: they
+    U16 remaskTo;   // are to be repainted where they stand; none when remaskTo is 0
 
     // To be called before every change of matrix, colour transform, character or ratio.
     void Modify();
@@ -89,8 +91,15 @@ struct SObject {
     bool IsClip() const { return clipDepth != 0; }
 
 private:
+    void Recalculate(const MATRIX* mat);
+    void InvalidateRemasked();
+    void InvalidateDrawn();
+    SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);
+    RColor* MaskColor() const;
     bool EdgesContain(const SPOINT* pt);
+    bool TakeColorFlags();
     SObject* FirstBeyond(U16 maskDepth) const;
+    void LeaveTimeline();
 };
 
 // Union of the character's bounds and those of all children, in the coordinates of the object's

@@ -1,0 +1,152 @@
+#include "core/display/display_list.h"
+
+#include "core/player/limits.h"
+#include "core/shape/character_parser.h"
+#include "core/stream/script_player.h"
+
+namespace {
+constexpr int kEdgesPerBlock = 600;
+constexpr int kObjectsPerBlock = 32;
+constexpr int kColorsPerBlock = 64;
+constexpr SRGB kWhite = {255, 255, 255, 255};
+
+// Blocks that hold `items` records.
+size_t Blocks(U32 items, int perBlock)
+{
+    return (static_cast<size_t>(items) + static_cast<size_t>(perBlock) - 1) /
+           static_cast<size_t>(perBlock);
+}
+} // namespace
+
+DisplayList::DisplayList()
+    : root{}, backgroundColor(kWhite), dirtyArea{}, dirtyList{},
+      edgeAlloc(sizeof(REdge), kEdgesPerBlock, 1, 0x22222222),
+      objectAlloc(sizeof(SObject), kObjectsPerBlock, 1, 0x55555555),
+      colorAlloc(sizeof(RColor), kColorsPerBlock, 1, 0x44444444)
+{
+    MatrixIdentity(&camera);
+    cameraCxform.Clear();
+    root.display = this;
+    MatrixIdentity(&root.xform.mat);
+    root.xform.cxform.Clear();
+    RectSetEmpty(&root.devBounds);
+    RectSetEmpty(&root.reservedRect);
+    root.visible = 1;
+    RectSetEmpty(&bitsDirty);
+    RectSetEmpty(&devDirtyRgn);
+    RectSetEmpty(&tabFocusRect);
+    UpdateDevViewRect();
+    ResetBudget();
+}
+
+DisplayList::~DisplayList()
+{
+    DropHeld();
+    root.FreeChildren();
+    while (threads) {
+        ScriptThread* thread = threads;
+        RemoveThread(thread);
+        thread->display = nullptr;
+    }
+}
+
+void DisplayList::ResetBudget()
+{
+    tagsLeft = gLimits.tagsPerDraw;
+    edgeAlloc.SetBudget(Blocks(gLimits.liveEdges, kEdgesPerBlock));
+    objectAlloc.SetBudget(Blocks(gLimits.liveObjects, kObjectsPerBlock));
+    colorAlloc.SetBudget(Blocks(gLimits.liveColors, kColorsPerBlock));
+}
+
+void DisplayList::UpdateDevViewRect()
+{
+    const bool valid = bits && bits->HasBits();
+    const S32 scale = antialias ? 4 : 1;
+    devViewRect = {0, (valid ? bits->Width() : 2000) * scale, 0,
+                   (valid ? bits->Height() : 2000) * scale};
+}
+
+// Colours are built for an output: those built for another one, or for none, go.
+void DisplayList::SetBits(CBitBuffer* buffer)
+{
+    bits = buffer;
+    root.FreeCacheTree();
+    UpdateDevViewRect();
+    InvalidateAll();
+}
+
+void DisplayList::SetBackgroundColor(SRGB color, int priority)
+{
+    if (priority <= backgroundPriority)
+        return;
+    backgroundPriority = priority;
+    if (color == backgroundColor)
+        return;
+    backgroundColor = color;
+    InvalidateAll();
+}
+
+void DisplayList::Reset()
+{
+    if (backgroundPriority >= 2)
+        return;
+    backgroundColor = kWhite;
+    backgroundPriority = 0;
+    InvalidateAll();
+}
+
+void DisplayList::CalcUpdate()
+{
+    if (!needCalcUpdate)
+        return;
+    root.CalcUpdate(&camera, false);
+    needCalcUpdate = 0;
+}
+
+// A thread that is on the list already moves to the head.
+void DisplayList::AddThread(ScriptThread* thread)
+{
+    RemoveThread(thread);
+    thread->nextThread = threads;
+    if (threads)
+        threads->prevThread = thread;
+    threads = thread;
+}
+
+void DisplayList::RemoveThread(ScriptThread* thread)
+{
+    if (threads != thread && !thread->prevThread)
+        return;
+    if (threadCursor == thread)
+        threadCursor = thread->nextThread;
+    (thread->prevThread ? thread->prevThread->nextThread : threads) = thread->nextThread;
+    if (thread->nextThread)
+        thread->nextThread->prevThread = thread->prevThread;
+    thread->nextThread = nullptr;
+    thread->prevThread = nullptr;
+}
+
+void DisplayList::FreeEdges(REdge* edges)
+{
+    while (edges) {
+        REdge* next = edges->next;
+        edgeAlloc.Free(edges);
+        edges = next;
+    }
+}
+
+void DisplayList::FreeCache()
+{
+    root.FreeCacheTree();
+    edgeAlloc.FreeEmpties();
+    objectAlloc.FreeEmpties();
+    colorAlloc.FreeEmpties();
+    raster.FreeEmpties();
+}
+
+SObject* DisplayList::HitTest(const SPOINT* pt)
+{
+    SObject* hit = nullptr;
+    root.HitTest(hit, {camera, cameraCxform}, pt);
+    return hit;
+}

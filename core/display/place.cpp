@@ -1,0 +1,226 @@
+// Placing, moving and removing display objects.
+#include <algorithm>
+#include <cstdio>
+
+#include "core/display/display_list.h"
+#include "core/player/limits.h"
+#include "core/stream/script_player.h"
+#include "core/stream/str.h"
+
+namespace {
+// Siblings passed over in a search that count as much work as one tag.
+constexpr U32 kSiblingsPerTag = 64;
+
+// Whether a move may show `fresh` in place of `old`. A sprite or button never becomes another type,
+// nor anything else one of them; a loaded movie and a movie's root stay what they are.
+bool MayReplace(const SCharacter* old, const SCharacter* fresh)
+{
+    if (!old || !fresh)
+        return false;
+    const auto fixed = [](U8 type) { return type == kCharLoadedMovie || type == kCharMovieRoot; };
+    if (fixed(old->type) || fixed(fresh->type))
+        return false;
+    const auto keepsType = [](U8 type) { return type == kCharSprite || type == kCharButton; };
+    return old->type == fresh->type || (!keepsType(old->type) && !keepsType(fresh->type));
+}
+} // namespace
+
+void PlaceInfo::Clear()
+{
+    *this = {};
+    MatrixIdentity(&mat);
+    cxform.Clear();
+}
+
+bool DisplayList::MayPlace(const SObject* parent, const SCharacter* character) const
+{
+    if (!character || parent->nesting >= gLimits.nesting)
+        return false;
+    if (character->type != kCharSprite && character->type != kCharButton)
+        return true;
+    while (parent && parent->character != character)
+        parent = parent->parent;
+    return parent == nullptr;
+}
+
+// The link to the first child at or above the depth. Long searches use up the tick's budget of
+// tags, so that crowded depths cannot stall it.
+SObject** DisplayList::FindLink(SObject* parent, U16 depth)
+{
+    U32 passed = 0;
+    SObject** link = &parent->bottomChild;
+    while (*link && (*link)->depth < depth) {
+        link = &(*link)->above;
+        passed++;
+    }
+    tagsLeft -= std::min(tagsLeft, passed / kSiblingsPerTag);
+    return link;
+}
+
+SObject* DisplayList::FindChild(SObject* parent, U16 depth) const
+{
+    SObject* child = parent->bottomChild;
+    while (child && child->depth < depth)
+        child = child->above;
+    return child && child->depth == depth ? child : nullptr;
+}
+
+// A second object at an occupied depth lands below the one that is there.
+SObject* DisplayList::PlaceObject(SObject* parent, const PlaceInfo* info)
+{
+    if (!parent)
+        parent = &root;
+    if (!MayPlace(parent, info->character))
+        return nullptr;
+    SObject* obj = static_cast<SObject*>(objectAlloc.Alloc());
+    if (!obj)
+        return nullptr;
+    SObject** link = FindLink(parent, info->depth);
+    SetPlacement(obj, parent, info);
+    obj->above = *link;
+    *link = obj;
+    NameObject(obj, info);
+    if (parent != holdParent) // FinishHold notes those that stay
+        NoteMask(obj);
+    obj->Modify();
+    StartObject(obj, info);
+    return obj;
+}
+
+void DisplayList::SetPlacement(SObject* obj, SObject* parent, const PlaceInfo* info)
+{
+    obj->display = this;
+    obj->parent = parent;
+    obj->character = info->character;
+    RetainCharacter(obj->character);
+    obj->depth = info->depth;
+    obj->ratio = info->ratio;
+    obj->xform = {info->mat, info->cxform};
+    obj->puppet = info->puppet;
+    obj->clipDepth = (info->flags & PlaceInfo::kClipDepth) ? info->clipDepth : U16(0);
+    obj->visible = 1;
+    obj->thread = parent->thread;
+    obj->serial = nextSerial++;
+    obj->nesting = U16(parent->nesting + 1);
+    RectSetEmpty(&obj->devBounds);
+    RectSetEmpty(&obj->reservedRect);
+}
+
+void DisplayList::NameObject(SObject* obj, const PlaceInfo* info)
+{
+    if (obj->character->type != kCharSprite || info->name) {
+        obj->name = CreateStr(info->name);
+        return;
+    }
+    char name[24];
+    std::snprintf(name, sizeof name, "instance%d", static_cast<int>(++instanceCount));
+    obj->name = CreateStr(name);
+}
+
+void DisplayList::StartObject(SObject* obj, const PlaceInfo* info)
+{
+    switch (obj->character->type) {
+    case kCharSprite:
+        StartSprite(obj);
+        break;
+    case kCharButton:
+        StartButton(obj);
+        break;
+    case kCharLoadedMovie:
+        StartLoadedMovie(obj, info);
+        break;
+    default:
+        break;
+    }
+}
+
+void DisplayList::StartButton(SObject* obj)
+{
+    const SButtonIdentity& saved = buttonIdentity;
+    obj->state = 1;
+    if (saved.parent != obj->parent || saved.parentSerial != obj->parent->serial ||
+        saved.character != obj->character || saved.depth != obj->depth || saved.ratio != obj->ratio)
+        return;
+    button = obj;
+    obj->state = U8(buttonState);
+}
+
+SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
+{
+    if (!parent)
+        parent = &root;
+    SObject* obj = *FindLink(parent, info->depth);
+    if (!obj || obj->depth != info->depth || obj->puppet)
+        return nullptr;
+    obj->Modify();
+    if ((info->flags & PlaceInfo::kCharacter) && MayReplace(obj->character, info->character)) {
+        SCharacter* old = obj->character;
+        obj->character = info->character;
+        RetainCharacter(obj->character);
+        ReleaseCharacter(old);
+        NoteMask(obj);
+    }
+    if (info->flags & PlaceInfo::kMatrix)
+        obj->xform.mat = info->mat;
+    if (info->flags & PlaceInfo::kCxform)
+        obj->xform.cxform = info->cxform;
+    if (info->flags & PlaceInfo::kRatio)
+        obj->ratio = info->ratio;
+    return obj;
+}
+
+// A mask shows and hides its siblings far outside its own bounds: when it comes or goes, those in
+// its range are to be repainted where they stand.
+void DisplayList::NoteMask(const SObject* mask)
+{
+    if (!mask->IsClip())
+        return;
+    SObject* parent = mask->parent;
+    if (parent->remaskTo == 0 || mask->depth < parent->remaskFrom)
+        parent->remaskFrom = mask->depth;
+    parent->remaskTo = std::max(parent->remaskTo, mask->clipDepth);
+    needCalcUpdate = 1;
+}
+
+void DisplayList::RemoveObject(SObject* parent, U16 depth)
+{
+    SObject** link = FindLink(parent ? parent : &root, depth);
+    if (*link && (*link)->depth == depth)
+        DoRemove(link);
+}
+
+void DisplayList::DoRemove(SObject** link)
+{
+    SObject* obj = *link;
+    if (obj->drawn)
+        InvalidateRect(&obj->devBounds);
+    NoteMask(obj);
+    *link = obj->above;
+    Discard(obj);
+}
+
+void DisplayList::RemoveThisObject(SObject* obj)
+{
+    if (!obj || !obj->parent)
+        return;
+    SObject** link = &obj->parent->bottomChild;
+    while (*link && *link != obj)
+        link = &(*link)->above;
+    if (!*link && obj->parent == holdParent) {
+        link = &holdList;
+        while (*link && *link != obj)
+            link = &(*link)->above;
+    }
+    if (*link)
+        DoRemove(link);
+}
+
+// Ends an object that is in no list any more.
+void DisplayList::Discard(SObject* obj)
+{
+    obj->FreeChildren();
+    if (button == obj)
+        button = nullptr;
+    obj->Free();
+    objectAlloc.Free(obj);
+}

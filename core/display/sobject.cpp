@@ -1,0 +1,161 @@
+// The object tree: change tracking, bounds, and the end of an object.
+#include <algorithm>
+
+#include "core/display/sobject.h"
+
+#include "core/display/display_list.h"
+#include "core/shape/character_parser.h"
+#include "core/stream/script_player.h"
+#include "core/stream/str.h"
+#include "core/stream/tags.h"
+
+void STransform::Concat(const STransform* inner)
+{
+    MatrixConcat(&inner->mat, &mat, &mat);
+    cxform.Concat(&inner->cxform);
+}
+
+void SObject::Modify()
+{
+    dirty = 1;
+    display->needCalcUpdate = 1;
+}
+
+void SObject::CalcUpdate(const MATRIX* parentMat, bool forced)
+{
+    MATRIX mat;
+    MatrixConcat(&xform.mat, parentMat, &mat);
+    forced = forced || dirty;
+    if (remaskTo != 0)
+        InvalidateRemasked(); // while the children still know their old places
+    if (forced)
+        Recalculate(&mat);
+    for (SObject* child = bottomChild; child; child = child->above)
+        child->CalcUpdate(&mat, forced);
+}
+
+void SObject::Recalculate(const MATRIX* mat)
+{
+    FreeCache();
+    if (drawn)
+        display->InvalidateRect(&devBounds);
+    drawn = 0;
+    CalcDevBounds(mat);
+    display->InvalidateRect(&devBounds);
+    dirty = 0;
+}
+
+// A mask in the range may reach further up than the range itself.
+void SObject::InvalidateRemasked()
+{
+    for (SObject* child = bottomChild; child && child->depth <= remaskTo; child = child->above) {
+        if (child->depth < remaskFrom)
+            continue;
+        child->InvalidateDrawn();
+        remaskTo = std::max(remaskTo, child->clipDepth);
+    }
+    remaskFrom = remaskTo = 0;
+}
+
+void SObject::InvalidateDrawn()
+{
+    if (drawn)
+        display->InvalidateRect(&devBounds);
+    for (SObject* child = bottomChild; child; child = child->above)
+        child->InvalidateDrawn();
+}
+
+void SObject::CalcDevBounds(const MATRIX* mat)
+{
+    RectSetEmpty(&devBounds);
+    if (!character)
+        return;
+    SRECT bounds = character->bounds;
+    if (character->type == kCharMorphShape && !RectIsEmpty(&bounds) &&
+        !RectIsEmpty(&character->endBounds))
+        Interpolate(&character->bounds, &character->endBounds, ratio, &bounds);
+    MatrixTransformRect(mat, &bounds, &devBounds);
+}
+
+// Kept apart from Draw: the parser's tables would stand on the stack once per level of the tree.
+void SObject::BuildEdges(const STransform* placed)
+{
+    if (edges || colors || !character || character->type != kCharShape)
+        return;
+    SCharacterParser parser(this, character->player, character->data, character->DataLen(), 0,
+                            &placed->mat);
+    parser.getAlpha = character->tagCode == kTagDefineShape3;
+    parser.cxform = placed->cxform;
+    parser.BuildEdges(true, &devBounds);
+}
+
+void SObject::FreeCache()
+{
+    display->FreeEdges(edges);
+    edges = nullptr;
+    while (colors) {
+        RColor* next = colors->nextColor;
+        colors->FreeCache();
+        display->colorAlloc.Free(colors);
+        colors = next;
+    }
+}
+
+void SObject::FreeCacheTree()
+{
+    FreeCache();
+    for (SObject* child = bottomChild; child; child = child->above)
+        child->FreeCacheTree();
+}
+
+void SObject::FreeChildren()
+{
+    while (bottomChild) {
+        SObject* child = bottomChild;
+        bottomChild = child->above;
+        if (child->drawn)
+            display->InvalidateRect(&child->devBounds);
+        display->Discard(child);
+    }
+}
+
+// A hold on this object's children ends with it.
+void SObject::Free()
+{
+    if (display->holdParent == this)
+        display->DropHeld();
+    FreeCache();
+    LeaveTimeline();
+    ReleaseCharacter(character);
+    character = nullptr;
+    FreeStr(dropTarget);
+    FreeStr(name);
+    dropTarget = nullptr;
+    name = nullptr;
+}
+
+static void UniteBounds(SObject* obj, const MATRIX* parentMat, SRECT* r)
+{
+    MATRIX mat;
+    SRECT own;
+    MatrixConcat(&obj->xform.mat, parentMat, &mat);
+    if (obj->character) {
+        MatrixTransformRect(&mat, &obj->character->bounds, &own);
+        RectUnion(r, &own, r);
+    }
+    for (SObject* child = obj->bottomChild; child; child = child->above)
+        UniteBounds(child, &mat, r);
+}
+
+void GetBoundingBox(SObject* obj, const MATRIX* mat, SRECT* r)
+{
+    RectSetEmpty(r);
+    UniteBounds(obj, mat, r);
+}
+
+void GetBoundingBox(SObject* obj, SRECT* r)
+{
+    MATRIX identity;
+    MatrixIdentity(&identity);
+    GetBoundingBox(obj, &identity, r);
+}

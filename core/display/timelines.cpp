@@ -1,0 +1,143 @@
+// The timelines of sprites and of movies shown in a sprite's place: how they start with their
+// object and end with it.
+#include <new>
+
+#include "core/display/display_list.h"
+#include "core/player/limits.h"
+#include "core/stream/script_player.h"
+#include "core/stream/str.h"
+
+namespace {
+// tagEnd of a timeline that has read no tag yet.
+constexpr S32 kNoTagYet = 0x20000000;
+
+// Counts one more holder of a movie's bytes. False when there is no memory for the count.
+bool ShareScript(ScriptPlayer* movie)
+{
+    if (!movie->sharedScript)
+        movie->sharedScript = new (std::nothrow) S32(1);
+    return movie->sharedScript != nullptr;
+}
+
+void CopyHeader(const ScriptPlayer* from, ScriptPlayer* to)
+{
+    to->splayer = from->splayer;
+    to->sourceName = CreateStr(from->sourceName);
+    to->script = from->script;
+    to->limit = from->limit;
+    to->len = from->len;
+    to->startPos = from->startPos;
+    to->scanPos = from->scanPos;
+    to->scriptLen = from->scriptLen;
+    to->numFrames = from->numFrames;
+    to->headerBytes = from->headerBytes;
+    for (size_t i = 0; i < sizeof from->header; i++)
+        to->header[i] = from->header[i];
+    to->gotHeader = from->gotHeader;
+    to->numFramesComplete = from->numFramesComplete;
+    to->frame = from->frame;
+    to->frameRate = from->frameRate;
+    to->frameDelay = from->frameDelay;
+    to->version = from->version;
+}
+
+// Rewinds a timeline without taking its data away.
+void RestartTimeline(ScriptThread* thread)
+{
+    const U8* script = thread->script;
+    const S32 limit = thread->limit, len = thread->len, frames = thread->numFrames;
+    const S32 error = thread->scriptErr;
+    thread->ClearState();
+    thread->script = script;
+    thread->limit = limit;
+    thread->len = len;
+    thread->numFrames = frames;
+    thread->scriptErr = error;
+    thread->pos = thread->startPos;
+    thread->tagEnd = kNoTagYet;
+}
+} // namespace
+
+void DisplayList::AttachTimeline(SObject* obj, ScriptThread* thread)
+{
+    obj->thread = thread;
+    thread->rootObject = obj;
+    thread->layerDepth = obj->depth;
+    thread->display = this;
+    AddThread(thread);
+}
+
+void DisplayList::StartSprite(SObject* obj)
+{
+    const SCharacter* character = obj->character;
+    auto* thread = new (std::nothrow) ScriptThread;
+    obj->thread = nullptr;
+    if (!thread)
+        return; // without memory the sprite stays empty
+    thread->ClearState();
+    thread->player = character->player;
+    thread->splayer = character->player->splayer;
+    thread->Attach(character->data, character->player->BytesFrom(character->data));
+    thread->len =
+        character->sprite.dataLen < thread->limit ? character->sprite.dataLen : thread->limit;
+    thread->tagEnd = kNoTagYet;
+    thread->numFrames = character->sprite.numFrames;
+    AttachTimeline(obj, thread);
+    thread->DrawFrame(0, false);
+}
+
+// A movie that is shown already is not shown twice; a clone needs all of its source's bytes.
+// Without a movie of its own the object has no timeline.
+void DisplayList::StartLoadedMovie(SObject* obj, const PlaceInfo* info)
+{
+    const bool clone = info->flags & PlaceInfo::kPrivateCopy;
+    obj->thread = nullptr;
+    ScriptPlayer* movie = clone ? CloneMovie(obj->character) : obj->character->player;
+    if (clone && obj->character->privateCopy)
+        obj->character->player = movie; // the source may be gone when this clone is cloned
+    if (!movie || movie->rootObject || (!clone && !ShareScript(movie)))
+        return;
+    RestartTimeline(movie);
+    AttachTimeline(obj, movie);
+    movie->DrawFrame(0, false);
+}
+
+// A second player over the bytes of a loaded movie, with a dictionary of its own: running the tags
+// fills it.
+ScriptPlayer* DisplayList::CloneMovie(const SCharacter* character)
+{
+    ScriptPlayer* source = character->player;
+    if (!source || !source->Complete() || clonedMovies >= gLimits.loadedMovies ||
+        !ShareScript(source))
+        return nullptr;
+    auto* copy = new (std::nothrow) ScriptPlayer;
+    if (!copy)
+        return nullptr;
+    CopyHeader(source, copy);
+    copy->sharedScript = source->sharedScript;
+    ++*copy->sharedScript;
+    copy->sharedCopy = true;
+    clonedMovies++;
+    return copy;
+}
+
+bool SObject::OwnsThread() const
+{
+    return thread && thread->rootObject == this;
+}
+
+// A movie's root object stands for a player that lives on without it; every other timeline dies
+// with its object.
+void SObject::LeaveTimeline()
+{
+    ScriptThread* own = OwnsThread() ? thread : nullptr;
+    thread = nullptr;
+    if (!own)
+        return;
+    own->rootObject = nullptr;
+    if (character->type == kCharMovieRoot)
+        return;
+    if (own->IsRoot() && static_cast<ScriptPlayer*>(own)->sharedCopy)
+        display->clonedMovies--;
+    delete own;
+}
