@@ -1,0 +1,17 @@
+# One number a scene. Cairo joins in where its development package is installed.
+find_package(benchmark QUIET)
+find_package(PkgConfig QUIET)
+if(PkgConfig_FOUND)
+  pkg_check_modules(CAIRO QUIET IMPORTED_TARGET cairo)
+endif()
+
+if(benchmark_FOUND)
+  add_executable(vexel_bench bench/bench_main.cpp bench/scene.cpp)
+  target_link_libraries(vexel_bench PRIVATE vexel_headless vexel_support benchmark::benchmark)
+  target_compile_definitions(vexel_bench PRIVATE VEXEL_SOURCE_DIR="${CMAKE_SOURCE_DIR}")
+  if(CAIRO_FOUND)
+    target_sources(vexel_bench PRIVATE bench/cairo_scene.cpp)
+    target_compile_definitions(vexel_bench PRIVATE VEXEL_BENCH_CAIRO)
+    target_link_libraries(vexel_bench PRIVATE PkgConfig::CAIRO)
+  endif()
+endif()

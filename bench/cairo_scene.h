@@ -1,0 +1,41 @@
+// The still picture of a player as cairo would draw it: the same outlines, fills and masks, kept as
+// retained paths and patterns, drawn into an image surface with the default anti-aliasing.
+#pragma once
+
+#include <cairo.h>
+
+#include <vector>
+
+#include "core/display/sobject.h"
+#include "platform/headless/native_player.h"
+
+class CairoScene {
+public:
+    explicit CairoScene(NativePlayerWnd* player);
+    ~CairoScene();
+    CairoScene(const CairoScene&) = delete;
+    CairoScene& operator=(const CairoScene&) = delete;
+
+    void Draw();
+    // Writes the surface as a PNG, to see that it shows the same picture.
+    bool Save(const char* path);
+
+private:
+    struct Item {
+        cairo_path_t* path;
+        cairo_pattern_t* paint; // null: a clip that the following items lie under
+        cairo_matrix_t matrix;
+        bool endClip; // no path: the clip ends here
+    };
+    struct Contours;
+
+    void AddTree(SObject* obj, STransform xform);
+    void AddShape(SObject* obj, const STransform& xform, bool clip);
+    void AddItem(const Contours& outline, cairo_pattern_t* paint, const MATRIX& mat);
+    cairo_pattern_t* PatternOf(const RColor* color) const;
+
+    NativePlayerWnd* player;
+    cairo_surface_t* surface;
+    cairo_t* cr;
+    std::vector<Item> items;
+};
