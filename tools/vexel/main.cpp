@@ -1,0 +1,74 @@
+#include "tools/vexel/commands.h"
+#include "tools/vexel/message.h"
+
+#include <cstdio>
+#include <string>
+
+namespace {
+
+constexpr char kHelp[] =
+    "usage: vexel render MOVIE -o OUT [options]    pictures of a movie\n"
+    "       vexel info MOVIE [--json]              header, tags, labels, characters\n"
+    "       vexel dump MOVIE                       every tag, one a line\n"
+    "       vexel --help | --version\n"
+    "\n"
+    "MOVIE is a file, or - for standard input.\n"
+    "\n"
+    "render:\n"
+    "  -o OUT                       a .png file, NAME%04d.png for a sequence, or - for one\n"
+    "                               picture on standard output\n"
+    "  --frame N                    picture N, counted from 1\n"
+    "  --frames A-B                 pictures A to B\n"
+    "                               (neither: picture 1, or one pass of the main timeline for a\n"
+    "                               sequence)\n"
+    "  --size WxH                   pixels (default: the movie's own)\n"
+    "  --quality low|high|best      (default: high)\n"
+    "  --background COLOR           #RRGGBB or transparent (default: the movie's own)\n"
+    "  --progress                   count the pictures on stderr\n"
+    "\n"
+    "exit codes: 0 done, 1 failed while running, 2 wrong command line, 3 not a movie or\n"
+    "unreadable, 5 stopped by a limit\n";
+
+struct Command {
+    const char* name;
+    int (*run)(std::span<char* const> words);
+};
+
+constexpr Command kCommands[] = {
+    {"render", RenderCommand},
+    {"info", InfoCommand},
+    {"dump", DumpCommand},
+};
+
+int Run(std::span<char* const> words)
+{
+    if (words.empty())
+        return ComplainUsage("a command is missing");
+    const std::string first = words[0];
+    if (first == "--help" || first == "-h" || first == "help") {
+        std::fputs(kHelp, stdout);
+        return kExitDone;
+    }
+    if (first == "--version") {
+        std::puts("vexel " VEXEL_VERSION);
+        return kExitDone;
+    }
+    for (const Command& command : kCommands) {
+        if (first == command.name)
+            return command.run(words.subspan(1));
+    }
+    return ComplainUsage("unknown command " + first);
+}
+
+} // namespace
+
+int main(int argc, char** argv)
+{
+    const std::span<char* const> words(argv, static_cast<size_t>(argc));
+    const int code = Run(argc > 0 ? words.subspan(1) : words);
+    if (std::fflush(stdout) != 0 || std::ferror(stdout)) {
+        Complain("standard output", "cannot write");
+        return code == kExitDone ? kExitFailed : code;
+    }
+    return code;
+}

@@ -1,0 +1,26 @@
+// What `vexel render` is asked to do.
+#pragma once
+
+#include "core/raster/color.h"
+#include "tools/vexel/output_file.h"
+
+#include <span>
+#include <string>
+
+struct RenderOptions {
+    std::string movie;
+    OutputName output;
+    bool wholePass = false; // one pass of the main timeline, whatever first and last say
+    int first = 1;          // pictures count from 1
+    int last = 1;
+    int width = 0; // pixels; 0 x 0 is the movie's own size
+    int height = 0;
+    int quality = 1; // 0 low, 1 high, 2 best
+    bool setBackground = false;
+    SRGB background; // alpha 0: transparent
+    bool progress = false;
+
+    // False after complaining about the command line.
+    bool Parse(std::span<char* const> words);
+    bool Transparent() const { return setBackground && background.alpha == 0; }
+};
