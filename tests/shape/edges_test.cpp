@@ -80,12 +80,6 @@ TEST(Edges, PiecesOfOneCurve)
             EXPECT_EQ(got, test.pieces) << test.what << reversed;
         }
     }
-    ShapeScene scene;
-    SCharacterParser p = scene.Parser();
-    const CURVE arch = Curve({0, 100}, {100, 3}, {200, 100});
-    p.AddCurve(&arch);
-    ASSERT_EQ(scene.Edges().size(), 2u);
-    EXPECT_EQ(scene.Edges()[0]->dir + scene.Edges()[1]->dir, 0);
 }
 
 TEST(Edges, ColorsAndRuleOfTheTwoSides)
@@ -283,12 +277,6 @@ TEST(Edges, BoxesHaveTheirSlopingSides)
     ASSERT_TRUE(list && list->next && !list->next->next);
     EXPECT_EQ(list->fillRule, kRuleEvenOdd);
     EXPECT_EQ(list->color1, &ink);
-    const MATRIX turned = ToMatrix(Mat::Rotate(45).Then(Mat::Scale(9000)));
-    AddRect(&box, &turned, &ink, &scene.display, &scene.obj.edges);
-    const std::vector<REdge*> edges = scene.Edges();
-    EXPECT_GE(edges.size(), 2u);
-    for (const auto& [y, d] : Imbalance(edges))
-        EXPECT_TRUE(y <= -16000 || y >= 15999) << y << ": " << d;
 }
 
 } // namespace

@@ -88,20 +88,6 @@ TEST(Records, NothingBehindTheDataIsSeen)
     }
 }
 
-TEST(Records, FailingNewStylesEndTheShape)
-{
-    ShapeScene scene;
-    ByteWriter out;
-    out.PutU16(0).UB(4, 1).UB(4, 1).UB(6, 0x10);
-    out.PutU8(0xFF).PutU16(50000).PutU8(0).PutU8(1);
-    scene.data = out.Bytes();
-    SCharacterParser p = scene.Parser();
-    ASSERT_TRUE(p.GetStyles());
-    CURVE c;
-    EXPECT_EQ(p.GetEdge(&c), SShapeParser::kEndOfShape);
-    EXPECT_EQ(p.Fill(2), nullptr);
-}
-
 // Whatever the bytes, every edge that reaches the raster obeys the raster's terms.
 TEST(Records, ArbitraryBytesMakeOnlySoundEdges)
 {

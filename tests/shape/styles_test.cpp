@@ -45,13 +45,53 @@ RColor* OnlyFill(ShapeScene& scene, SCharacterParser& p)
     return p.GetStyles() ? p.Fill(1) : nullptr;
 }
 
-// Where an inverse takes a device point, 16.16 or 24.8 as its translation says; wraps as painting
-// does.
+// Where an inverse takes a device point whose coordinates carry `shift` fraction bits; it wraps as
+// painting does.
 SPOINT Unmap(const MATRIX& inverse, S64 x, S64 y, int shift)
 {
-    const S64 u = (inverse.a * (x << shift) >> 16) + (inverse.c * (y << shift) >> 16) + inverse.tx;
-    const S64 v = (inverse.b * (x << shift) >> 16) + (inverse.d * (y << shift) >> 16) + inverse.ty;
-    return {S32(u), S32(v)};
+    const auto part = [shift](S64 f, S64 v) { return f * (v << shift) >> 16; };
+    return {S32(part(inverse.a, x) + part(inverse.c, y) + inverse.tx),
+            S32(part(inverse.b, x) + part(inverse.d, y) + inverse.ty)};
+}
+
+struct Place {
+    double x, y;
+};
+
+Place Map(const Mat& m, Place p)
+{
+    return {(m.a * p.x + m.c * p.y) / 65536 + m.tx, (m.b * p.x + m.d * p.y) / 65536 + m.ty};
+}
+
+// A fill is put through the parser; its middle and two corners have to be found again from the
+// pixels where they stand, to about one pixel (`slack`, in units of the fill).
+void ExpectInverse(const Mat& fill, const Mat& placement, RColorType type, int antialias)
+{
+    const int shift = type == kColorBitmap ? 16 : 8;
+    const double size = type == kColorBitmap ? 64 : 16384;
+    const double slack = (type == kColorBitmap ? 3.0 : 700.0) * (1 << shift);
+    ShapeScene scene;
+    scene.display.raster.SetAntialias(antialias);
+    U8 pixel = 0;
+    SBitmapCore bitmap = {};
+    bitmap.baseAddr = &pixel;
+    RColor color;
+    color.SetUp(&scene.display.raster);
+    color.colorType = type;
+    color.bitmap = &bitmap;
+    color.bitmapMat = color.gradientMat = ToMatrix(fill);
+    SCharacterParser p =
+        scene.Parser(ToMatrix(antialias ? placement.Then(Mat::Scale(4)) : placement));
+    p.raster = &scene.display.raster;
+    p.SetupColor(&color);
+    const MATRIX& inverse = type == kColorBitmap ? color.bitmapInv : color.gradientInv;
+    for (double x : {-size, 0.0, size}) {
+        const Place at = Map(placement, Map(fill, {x, x / 2}));
+        const SPOINT found = Unmap(inverse, std::lround(at.x), std::lround(at.y), shift);
+        EXPECT_NEAR(found.x, x * (1 << shift), slack) << type << antialias;
+        EXPECT_NEAR(found.y, x / 2 * (1 << shift), slack) << type << antialias;
+    }
+    color.FreeCache();
 }
 
 TEST(Styles, CountsAndTheirEscape)
@@ -130,20 +170,6 @@ TEST(Styles, SolidColorsAreTransformedThenPremultiplied)
     }
 }
 
-TEST(Styles, LineThicknessIsInDeviceUnits)
-{
-    ShapeScene scene;
-    ShapeBuilder shape;
-    for (U16 width : {0, 3, 400})
-        shape.AddLine({width, {}});
-    scene.Load(shape);
-    SCharacterParser p = scene.Parser(ToMatrix(Mat::Scale(0.05)));
-    ASSERT_TRUE(p.GetStyles());
-    EXPECT_EQ(p.LineStyle(1).thickness, 0);
-    EXPECT_EQ(p.LineStyle(2).thickness, 1);
-    EXPECT_NEAR(p.LineStyle(3).thickness, 20, 1);
-}
-
 TEST(Styles, RampsKeepEightStopsInOrder)
 {
     ShapeScene scene;
@@ -219,50 +245,20 @@ TEST(Styles, BitmapFillsWithoutPixelsAreRed)
     }
 }
 
-// The middle and the corners of the gradient square, and of a bitmap of 64 by 64 pixels, are found
-// again from where they stand on the screen, near the origin and thousands of pixels away.
+// Far away the shifted translations need more than 32 bits.
 TEST(Styles, InversesFindThePlaceInTheFill)
 {
-    const Mat placements[] = {Mat::Scale(0.05), Mat::Scale(0.05).ThenTranslate(-30, 12),
+    const Mat placements[] = {Mat::Scale(0.05).ThenTranslate(-30, 12), Mat::Scale(1),
                               Mat::Rotate(30).Then(Mat::Scale(0.2)).ThenTranslate(100, 3000),
                               Mat{-0x1000, 0x2000, 0x800, 0x3000, -2500, 40}};
-    for (S32 away : {0, 500, 60000}) {
-        for (const Mat& placement : placements) {
-            ShapeScene scene;
-            RColor color;
-            color.SetUp(&scene.display.raster);
-            SBitmapCore bitmap = {};
-            U8 pixel = 0;
-            bitmap.baseAddr = &pixel;
-            color.bitmap = &bitmap;
-            const Mat fills[] = {Mat::Scale(20).ThenTranslate(away, 300 - away),
-                                 Mat::Gradient(away, -away, 2000, 1000, 20)};
-            color.bitmapMat = ToMatrix(fills[0]);
-            color.gradientMat = ToMatrix(fills[1]);
-            SCharacterParser p = scene.Parser(ToMatrix(placement));
-            p.raster = &scene.display.raster;
-            for (int i : {0, 1}) {
-                color.colorType = i == 0 ? kColorBitmap : kColorGradient;
-                p.SetupColor(&color);
-                const int shift = i == 0 ? 16 : 8;
-                const double size = i == 0 ? 64 : 16384;
-                const Mat& f = fills[i];
-                for (double x : {-size, 0.0, size}) {
-                    const double y = x / 2;
-                    const double sx = (f.a * x + f.c * y) / 65536 + f.tx;
-                    const double sy = (f.b * x + f.d * y) / 65536 + f.ty;
-                    const double dx = (placement.a * sx + placement.c * sy) / 65536 + placement.tx;
-                    const double dy = (placement.b * sx + placement.d * sy) / 65536 + placement.ty;
-                    const SPOINT at = Unmap(i == 0 ? color.bitmapInv : color.gradientInv,
-                                            S64(std::lround(dx)), S64(std::lround(dy)), shift);
-                    // One device pixel either way, in units of the fill.
-                    const double slack = (i == 0 ? 3.0 : 700.0) * (1 << shift);
-                    EXPECT_NEAR(at.x, x * (1 << shift), slack) << i << " away " << away;
-                    EXPECT_NEAR(at.y, y * (1 << shift), slack) << i << " away " << away;
-                }
+    for (S32 away : {0, 500, 60000})
+        for (const Mat& placement : placements)
+            for (int antialias : {0, 1}) {
+                ExpectInverse(Mat::Scale(20).ThenTranslate(away, 300 - away), placement,
+                              kColorBitmap, antialias);
+                ExpectInverse(Mat::Gradient(away, -away, 2000, 1000, 20), placement, kColorGradient,
+                              antialias);
             }
-        }
-    }
 }
 
 TEST(Styles, CutShortOrOutOfColors)
