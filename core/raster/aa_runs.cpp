@@ -2,87 +2,8 @@
 // of one pixel row and resolved to pixels of 4 x 4 samples.
 #include <algorithm>
 
+#include "core/raster/gradient.h"
 #include "core/raster/raster.h"
-
-void CRaster::BeginRow()
-{
-    ++rowSerial;
-    rowLost = false;
-    for (GrowBuffer<RSpan>& line : sublines)
-        line.Clear();
-    stackColors.Clear();
-    stacks.Clear();
-    RStack nothing = {};
-    nothing.isSolid = true;
-    rowLost = !stacks.Push(nothing);
-}
-
-void CRaster::RecordSpan(S32 xmax)
-{
-    PushSpan(xmax, InternStack(Collect()));
-}
-
-void CRaster::PushSpan(S32 xmax, U32 stack)
-{
-    GrowBuffer<RSpan>& line = sublines[y & 3];
-    size_t n = line.size();
-    if (n && line[n - 1].stack == stack)
-        line[n - 1].xmax = xmax;
-    else if (!line.Push({xmax, stack}))
-        rowLost = true;
-}
-
-// What is right of the last crossing shows nothing.
-void CRaster::EndSubline()
-{
-    if (paintX < areaDev.xmax)
-        PushSpan(areaDev.xmax, 0);
-}
-
-bool CRaster::SameStack(const RStack& s, int count) const
-{
-    return s.count == U32(count) &&
-           std::equal(collected, collected + count, stackColors.data() + s.first);
-}
-
-// The row's stack with the collected colours. Those with the same top colour are linked, and only a
-// few are compared: a stack that is entered twice costs time, never a wrong pixel.
-U32 CRaster::InternStack(int count)
-{
-    if (count == 0)
-        return 0;
-    RColor* top = collected[0];
-    U32 newest = top->spanRow == rowSerial ? top->spanStack : 0;
-    int tries = 8;
-    for (U32 i = newest; i && tries-- > 0; i = stacks[i].next)
-        if (SameStack(stacks[i], count))
-            return i;
-    U32 made = NewStack(count, newest);
-    if (made) {
-        top->spanRow = rowSerial;
-        top->spanStack = made;
-    }
-    return made;
-}
-
-U32 CRaster::NewStack(int count, U32 next)
-{
-    RStack s = {U32(stackColors.size()), U32(count), next, 0, true};
-    for (int i = 0; i < count; ++i) {
-        if (!stackColors.Push(collected[i])) {
-            rowLost = true;
-            return 0;
-        }
-    }
-    for (int i = count - 1; i >= 0; --i) {
-        s.isSolid = s.isSolid && collected[i]->colorType == kColorSolid;
-        s.solid = BlendLanes(s.solid, ToLanes(collected[i]->rgb));
-    }
-    if (stacks.Push(s))
-        return U32(stacks.size() - 1);
-    rowLost = true;
-    return 0;
-}
 
 void CRaster::PaintAARuns()
 {
@@ -98,9 +19,7 @@ void CRaster::PaintAARuns()
     RRun run;
     for (run.xmin = areaDev.xmin; run.xmin < areaDev.xmax; run.xmin = run.xmax) {
         run.xmax = std::min(std::min(at[0]->xmax, at[1]->xmax), std::min(at[2]->xmax, at[3]->xmax));
-        for (int i = 0; i < 4; ++i)
-            run.stacks[i] = at[i]->stack;
-        MakeRun(&run);
+        MakeRun(&run, at);
         PaintRun(run);
         for (int i = 0; i < 4; ++i)
             at[i] += at[i]->xmax == run.xmax;
@@ -109,26 +28,30 @@ void CRaster::PaintAARuns()
     FlushPixels();
 }
 
-void CRaster::MakeRun(RRun* run) const
+void CRaster::MakeRun(RRun* run, const RSpan* const* at) const
 {
-    const U32* s = run->stacks;
-    run->same = s[0] == s[1] && s[0] == s[2] && s[0] == s[3];
-    if (run->same) {
-        run->isSolid = stacks[s[0]].isSolid;
-        run->sum = stacks[s[0]].solid * 4;
-        return;
-    }
+    run->kinds = 0;
     run->isSolid = true;
     run->sum = 0;
     for (int i = 0; i < 4; ++i) {
-        run->isSolid = run->isSolid && stacks[s[i]].isSolid;
-        run->sum += stacks[s[i]].solid;
+        U32 stack = at[i]->stack;
+        run->isSolid = run->isSolid && stacks[stack].isSolid;
+        run->sum += stacks[stack].solid;
+        int k = 0;
+        while (k < run->kinds && run->stacks[k] != stack)
+            ++k;
+        if (k == run->kinds) {
+            run->stacks[k] = stack;
+            run->weights[k] = 0;
+            ++run->kinds;
+        }
+        ++run->weights[k];
     }
 }
 
 void CRaster::PaintRun(const RRun& run)
 {
-    if ((run.stacks[0] | run.stacks[1] | run.stacks[2] | run.stacks[3]) == 0)
+    if (run.kinds == 1 && run.stacks[0] == 0)
         return;
     S32 first = run.xmin >> 2;
     S32 last = run.xmax >> 2;
@@ -151,22 +74,24 @@ Lanes CRaster::CalcColor(const RRun& run, S32 x)
 {
     if (run.isSolid)
         return run.sum;
-    if (run.same)
-        return StackColor(stacks[run.stacks[0]], x) * 4;
     Lanes sum = 0;
-    for (U32 stack : run.stacks)
-        sum += StackColor(stacks[stack], x);
+    for (int k = 0; k < run.kinds; ++k)
+        sum += StackColor(run.stacks[k], x) * run.weights[k];
     return sum;
 }
 
-Lanes CRaster::StackColor(const RStack& stack, S32 x)
+// Blended from the bottom up. Every stack keeps its last pixel: neighbouring runs ask for it again,
+// and stacks with the same lower part share its value. As deep as the stack, which is bounded.
+Lanes CRaster::StackColor(U32 stack, S32 x)
 {
-    if (stack.isSolid)
-        return stack.solid;
-    Lanes sum = 0;
-    for (U32 i = stack.count; i-- > 0;)
-        sum = BlendLanes(sum, PixelColor(stackColors[stack.first + i], x));
-    return sum;
+    RStack& s = stacks[stack];
+    if (s.isSolid)
+        return s.solid;
+    if (s.pixelX != x) {
+        s.pixel = BlendLanes(StackColor(s.below, x), PixelColor(s.color, x));
+        s.pixelX = x;
+    }
+    return s.pixel;
 }
 
 // A colour's own pixel; each keeps the last one, because neighbouring runs ask for it again.
@@ -183,13 +108,6 @@ Lanes CRaster::PixelColor(RColor* c, S32 x)
         c->pixValid = 1;
     }
     return ToLanes(c->pixValue);
-}
-
-RGBI CRaster::BitmapPixel(RColor* c, S32 x)
-{
-    RGBI value = {};
-    CalcBitmapPixel(c, x, &value);
-    return value;
 }
 
 void CRaster::AddCoverage(S32 x, Lanes value)
@@ -225,33 +143,36 @@ void CRaster::EmitPixel(S32 x, Lanes value)
 
 void CRaster::FlushPixels()
 {
-    if (pendingCount && pendingOpaque)
-        ops->writeRow(rowBits, pendingX, pending, pendingCount);
-    else if (pendingCount)
-        BlendToOutput(pendingX, pending, pendingCount);
+    if (pendingCount)
+        EmitPixels(pendingX, pending, pendingCount, pendingOpaque);
     pendingCount = 0;
     pendingOpaque = true;
+}
+
+void CRaster::EmitPixels(S32 x, const RGBI* src, S32 n, bool opaque)
+{
+    if (opaque)
+        ops->writeRow(rowBits, x, src, n);
+    else
+        BlendToOutput(x, src, n);
 }
 
 // Whole pixels x0..x1 of one run.
 void CRaster::PaintInterior(const RRun& run, S32 x0, S32 x1)
 {
-    if (run.same && stacks[run.stacks[0]].count == 1) {
-        RColor* const* c = stackColors.data() + stacks[run.stacks[0]].first;
-        for (S32 x = x0; x < x1; x += kPiece)
-            DrawCollected(x, std::min(x + kPiece, x1), c, 1);
-        return;
-    }
-    if (run.isSolid) {
+    const RStack& first = stacks[run.stacks[0]];
+    bool single = run.kinds == 1 && first.count == 1;
+    if (run.isSolid && !(single && first.color->transparent)) {
         PaintFlat(run.sum >> 2 & kLaneMask, x0, x1);
         return;
     }
-    if (run.same) {
-        PaintStackInterior(stacks[run.stacks[0]], x0, x1);
-        return;
+    for (S32 x = x0; x < x1; x += kPiece) {
+        S32 n = std::min(kPiece, x1 - x);
+        if (single)
+            DrawCollected(x, x + n, &first.color, 1);
+        else
+            PaintMixed(run, x, n);
     }
-    for (S32 x = x0; x < x1; ++x)
-        EmitPixel(x, CalcColor(run, x) >> 2 & kLaneMask);
 }
 
 void CRaster::PaintFlat(Lanes value, S32 x0, S32 x1)
@@ -265,16 +186,75 @@ void CRaster::PaintFlat(Lanes value, S32 x0, S32 x1)
 }
 
 // The same as single pixels, a row at a time.
-void CRaster::PaintStackInterior(const RStack& stack, S32 x0, S32 x1)
+void CRaster::PaintMixed(const RRun& run, S32 x, S32 n)
 {
-    RColor* const* colors = stackColors.data() + stack.first;
-    for (S32 x = x0; x < x1; x += kPiece) {
-        S32 n = std::min(kPiece, x1 - x);
-        for (U32 i = stack.count; i-- > 0;)
-            BuildPixelRow(colors[i], x, n, piece, i + 1 < stack.count);
-        if (colors[stack.count - 1]->transparent)
-            BlendToOutput(x, piece, n);
-        else
-            ops->writeRow(rowBits, x, piece, n);
+    bool covers = true;
+    for (int k = 0; k < run.kinds; ++k)
+        covers = covers && stacks[run.stacks[k]].covers;
+    BuildRunRows(run, x, n);
+    if (run.kinds > 1)
+        SumRows(run, n);
+    EmitPixels(x, rows[0], n, covers);
+}
+
+// Leaves the rows' average over the four sub-scanlines in the first row.
+void CRaster::SumRows(const RRun& run, S32 n)
+{
+    for (S32 i = 0; i < n; ++i) {
+        Lanes sum = 0;
+        for (int k = 0; k < run.kinds; ++k)
+            sum += ToLanes(rows[k][i]) * run.weights[k];
+        rows[0][i] = FromLanes(sum >> 2 & kLaneMask);
     }
+}
+
+// Builds a row of pixels for each of the run's stacks. The stacks are walked together from the
+// bottom, so that a colour that stands in several is computed once.
+void CRaster::BuildRunRows(const RRun& run, S32 x, S32 n)
+{
+    RColor* lists[4][kMaxCollected];
+    int left[4];
+    for (int k = 0; k < run.kinds; ++k) {
+        left[k] = 0;
+        for (U32 s = run.stacks[k]; s; s = stacks[s].below)
+            lists[k][left[k]++] = stacks[s].color;
+        std::fill_n(rows[k], n, RGBI());
+    }
+    for (;;) {
+        RColor* lowest = nullptr;
+        for (int k = 0; k < run.kinds; ++k)
+            if (left[k] && (!lowest || lists[k][left[k] - 1]->order < lowest->order))
+                lowest = lists[k][left[k] - 1];
+        if (!lowest)
+            return;
+        bool built = false;
+        for (int k = 0; k < run.kinds; ++k) {
+            if (left[k] == 0 || lists[k][left[k] - 1] != lowest)
+                continue;
+            --left[k];
+            if (!built)
+                BuildPixelRow(lowest, x, n);
+            built = true;
+            BlendPixelRow(lowest, rows[k], n);
+        }
+    }
+}
+
+// A colour's pixels from x on, each as if computed singly, in `piece`; a solid colour needs none.
+void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n)
+{
+    if (c->colorType == kColorGradient) {
+        BuildGradientPixels(c, x, n, piece);
+        return;
+    }
+    for (S32 i = 0; i < n && c->colorType == kColorBitmap; ++i)
+        CalcBitmapPixel(c, x + i, &piece[i]);
+}
+
+void CRaster::BlendPixelRow(RColor* c, RGBI* row, S32 n)
+{
+    if (c->colorType == kColorSolid)
+        CompositeRGBSolid(&c->rgb, row, n);
+    else
+        CompositeRGB(piece, row, n);
 }

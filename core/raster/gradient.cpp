@@ -82,6 +82,52 @@ S32 RadialIndex(const SPOINT& u)
     return std::min(PointLength(&u) >> 14, kLastEntry);
 }
 
+// The index is a length, and lengths come from a table that is good to 1/8192 at these sizes. So
+// the square of the true length settles the index wherever it is further than that from a ring's
+// border: kSure[i] are the squares between which entry i is certain. Near a border the length
+// itself decides.
+struct SureSquares {
+    U64 low, high;
+};
+SureSquares kSure[kRampEntries];
+
+void BuildSureSquares()
+{
+    for (U64 i = 0; i < kRampEntries; ++i) {
+        U64 inner = (i << 14) + (i << 14) / 4096 + 64;
+        U64 outer = ((i + 1) << 14) - ((i + 1) << 14) / 4096 - 64;
+        kSure[i] = {inner * inner, i == kLastEntry ? ~U64(0) : outer * outer};
+    }
+    kSure[0].low = 0;
+}
+
+// u at pixel x + i is the pixel's own product, floored, plus what is the same for the whole row.
+void RadialPixelIndices(const RColor* color, S32 x, S32 n, U16* index)
+{
+    S64 a = color->gradientInv.a, b = color->gradientInv.b;
+    S64 ax = a * x, bx = b * x;
+    SPOINT u = GradientPoint(color, x);
+    S32 restX = u.x - S32(ax >> 8), restY = u.y - S32(bx >> 8);
+    S32 at = RadialIndex(u);
+    for (S32 i = 0; i < n; ++i, ax += a, bx += b) {
+        u = {S32(ax >> 8) + restX, S32(bx >> 8) + restY};
+        U64 square = U64(S64(u.x) * u.x) + U64(S64(u.y) * u.y);
+        while (at < kLastEntry && square >= kSure[at + 1].low)
+            ++at;
+        while (at > 0 && square <= kSure[at - 1].high)
+            --at;
+        if (square < kSure[at].low || square > kSure[at].high)
+            at = RadialIndex(u);
+        index[i] = U16(at);
+    }
+}
+
+void UnpackRamp(const RColor* color, const U16* index, S32 n, RGBI* dst)
+{
+    for (S32 i = 0; i < n; ++i)
+        dst[i] = FromLanes(UnpackLanes(color->builtRamp[index[i]]));
+}
+
 // Along a slab the index is carried from pixel to pixel and corrected against the squares, so it
 // starts anew with each slab and can differ by one from a single pixel's.
 class RadialWalk {
@@ -167,10 +213,8 @@ void DrawGradientSlab(RColor* color, S32 x0, S32 x1)
 
 void BuildGradientSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
 {
-    ForPieces(color, x0, x1, [=](const U16* index, S32 x, S32 n) {
-        for (S32 i = 0; i < n; ++i)
-            dst[x - x0 + i] = FromLanes(UnpackLanes(color->builtRamp[index[i]]));
-    });
+    ForPieces(color, x0, x1,
+              [=](const U16* index, S32 x, S32 n) { UnpackRamp(color, index, n, dst + (x - x0)); });
 }
 
 void CompositeGradientSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
@@ -192,6 +236,7 @@ void BuildRenderTables()
         return;
     for (S32 i = 0; i <= kRampEntries; ++i)
         kSquares[i] = U16(std::min(i * i, 65535));
+    BuildSureSquares();
 }
 
 void BuildGradientCache(RColor* color)
@@ -207,23 +252,24 @@ void BuildGradientCache(RColor* color)
     color->buildSlabProc = color->transparent ? CompositeGradientSlab : BuildGradientSlab;
 }
 
-void GradientPixelIndices(const RColor* color, S32 x, S32 n, U16* index)
+void BuildGradientPixels(const RColor* color, S32 x, S32 n, RGBI* dst)
 {
-    if (color->gradientType != kFillRadial) {
-        LinearIndices(color, x, n, index);
+    if (!color->builtRamp) {
+        std::fill_n(dst, n, RGBI());
         return;
     }
-    for (S32 i = 0; i < n; ++i)
-        index[i] = U16(RadialIndex(GradientPoint(color, x + i)));
+    U16 index[kPiece];
+    for (S32 done = 0; done < n; done += kPiece) {
+        S32 count = std::min(kPiece, n - done);
+        if (color->gradientType == kFillRadial)
+            RadialPixelIndices(color, x + done, count, index);
+        else
+            LinearIndices(color, x + done, count, index);
+        UnpackRamp(color, index, count, dst + done);
+    }
 }
 
 void CalcGradientPixel(RColor* color, S32 x, RGBI* dst)
 {
-    if (!color->builtRamp) {
-        *dst = RGBI();
-        return;
-    }
-    U16 index;
-    GradientPixelIndices(color, x, 1, &index);
-    *dst = FromLanes(UnpackLanes(color->builtRamp[index]));
+    BuildGradientPixels(color, x, 1, dst);
 }

@@ -7,6 +7,6 @@
 // without stops, the colour draws nothing.
 void BuildGradientCache(RColor* color);
 
-// The ramp index of each of n pixels from x in the raster's current row, each computed by itself:
-// what single pixels have. Rows made of single pixels use it too, so that both always agree.
-void GradientPixelIndices(const RColor* color, S32 x, S32 n, U16* index);
+// n pixels of a gradient colour from x in the raster's current row, each with the value that it has
+// when computed singly.
+void BuildGradientPixels(const RColor* color, S32 x, S32 n, RGBI* dst);

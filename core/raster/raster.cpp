@@ -55,10 +55,10 @@ void CRaster::BeginPaint()
     layersFull = false;
     work = 0;
     buckets.Clear();
-    size_t rows = size_t(areaDev.ymax - areaDev.ymin);
-    if (areaDev.xmax <= areaDev.xmin || !buckets.Reserve(rows))
+    size_t scanlines = size_t(areaDev.ymax - areaDev.ymin);
+    if (areaDev.xmax <= areaDev.xmin || !buckets.Reserve(scanlines))
         return;
-    for (size_t i = 0; i < rows; ++i)
+    for (size_t i = 0; i < scanlines; ++i)
         buckets.Push(nullptr);
 }
 

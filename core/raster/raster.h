@@ -28,24 +28,29 @@ struct RSpan {
     U32 stack; // index of an RStack of the row; 0: nothing
 };
 
-// The colours that count in a span, top first; shared by all spans of a pixel row that show the
-// same.
+// The colours that count in a span, as a top colour over another stack of the same pixel row. Equal
+// stacks are one entry, and stacks with the same lower part share it.
 struct RStack {
-    U32 first; // index of the first of `count` entries of the row's colour store
-    U32 count;
-    U32 next;    // older stack with the same top colour in this row, 0 when none
-    Lanes solid; // the blended colour, when isSolid
-    bool isSolid;
+    RColor* color; // the top
+    U32 below;     // index of the stack under it; 0: nothing
+    U32 next;      // older stack of the row with the same top, 0 when none
+    U32 count;     // colours in all
+    bool isSolid;  // all of them are solid: `solid` is their blend
+    bool covers;   // the lowest is opaque
+    Lanes solid;
+    S32 pixelX;  // the last pixel computed singly, -1 when none ...
+    Lanes pixel; // ... and its value
 };
 
 // One horizontal run of a pixel row: where its four sub-scanlines show the same four stacks.
 struct RRun {
     S32 xmin; // quarter pixels, half-open
     S32 xmax;
-    U32 stacks[4];
-    bool same;    // all four are one stack
-    bool isSolid; // every stack is solid, so that the run has one colour
-    Lanes sum;    // the sum over the four stacks, when isSolid
+    int kinds;      // different stacks among the four, 1 to 4
+    U32 stacks[4];  // `kinds` of them ...
+    U32 weights[4]; // ... and in how many sub-scanlines each is seen
+    bool isSolid;   // every stack is solid, so that the run has one colour
+    Lanes sum;      // the sum over the four sub-scanlines, when isSolid
 };
 
 class CRaster {
@@ -134,31 +139,36 @@ private:
     void CompositeSlab(S32 x0, S32 x1, RColor* const* colors, int count);
     void ReadBackground(S32 x, S32 n, RGBI* dst) const;
     bool BackgroundCovers() const;
-    void BlendToOutput(S32 x, RGBI* src, S32 n);
-    void BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst, bool over);
+    void BlendToOutput(S32 x, const RGBI* src, S32 n);
 
-    // aa_runs.cpp: spans with anti-aliasing
+    // aa_spans.cpp: sub-scanlines as spans of stacks
     void BeginRow();
     void RecordSpan(S32 xmax);
     void PushSpan(S32 xmax, U32 stack);
     void EndSubline();
-    bool SameStack(const RStack& stack, int count) const;
     U32 InternStack(int count);
-    U32 NewStack(int count, U32 next);
+    U32 FindStack(RColor* top, U32 below);
+    U32 NewStack(RColor* top, U32 below, U32 next);
+
+    // aa_runs.cpp: spans merged into runs, runs into pixels
     void PaintAARuns();
-    void MakeRun(RRun* run) const;
+    void MakeRun(RRun* run, const RSpan* const* at) const;
     void PaintRun(const RRun& run);
     Lanes CalcColor(const RRun& run, S32 x);
-    Lanes StackColor(const RStack& stack, S32 x);
+    Lanes StackColor(U32 stack, S32 x);
     Lanes PixelColor(RColor* c, S32 x);
-    RGBI BitmapPixel(RColor* c, S32 x);
     void AddCoverage(S32 x, Lanes value);
     void EmitCoverage();
     void EmitPixel(S32 x, Lanes value);
+    void EmitPixels(S32 x, const RGBI* src, S32 n, bool opaque);
     void FlushPixels();
     void PaintInterior(const RRun& run, S32 x0, S32 x1);
     void PaintFlat(Lanes value, S32 x0, S32 x1);
-    void PaintStackInterior(const RStack& stack, S32 x0, S32 x1);
+    void PaintMixed(const RRun& run, S32 x, S32 n);
+    void BuildRunRows(const RRun& run, S32 x, S32 n);
+    void BuildPixelRow(RColor* c, S32 x, S32 n);
+    void BlendPixelRow(RColor* c, RGBI* row, S32 n);
+    void SumRows(const RRun& run, S32 n);
 
     CBitBuffer* output = nullptr;
     CBitBuffer* backgroundBits = nullptr;
@@ -187,14 +197,14 @@ private:
     U32 rowSerial = 0; // of the pixel row whose spans are being recorded
     GrowBuffer<RSpan> sublines[4];
     GrowBuffer<RStack> stacks; // entry 0 is the empty stack
-    GrowBuffer<RColor*> stackColors;
-    bool rowLost = false; // memory ran out: the row stays unpainted
-    S32 coverX = 0;       // pixel being accumulated ...
-    Lanes cover = 0;      // ... and its sum
+    bool rowLost = false;      // memory ran out: the row stays unpainted
+    S32 coverX = 0;            // pixel being accumulated ...
+    Lanes cover = 0;           // ... and its sum
     bool covering = false;
     S32 pendingX = 0; // finished pixels that wait to be written side by side
     S32 pendingCount = 0;
     bool pendingOpaque = true;
     RGBI pending[kPiece];
     RGBI piece[kPiece];
+    RGBI rows[4][kPiece]; // of the stacks of a run whose sub-scanlines differ
 };

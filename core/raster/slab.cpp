@@ -1,7 +1,6 @@
 // Spans of whole pixels in the output.
 #include <algorithm>
 
-#include "core/raster/gradient.h"
 #include "core/raster/raster.h"
 
 void CRaster::DrawCollected(S32 x0, S32 x1, RColor* const* colors, int count)
@@ -43,7 +42,7 @@ bool CRaster::BackgroundCovers() const
 }
 
 // Blends n finished pixels over the background and writes them.
-void CRaster::BlendToOutput(S32 x, RGBI* src, S32 n)
+void CRaster::BlendToOutput(S32 x, const RGBI* src, S32 n)
 {
     RGBI background[kPiece];
     for (S32 done = 0; done < n; done += kPiece) {
@@ -51,26 +50,5 @@ void CRaster::BlendToOutput(S32 x, RGBI* src, S32 n)
         ReadBackground(x + done, count, background);
         CompositeRGB(src + done, background, count);
         ops->writeRow(rowBits, x + done, background, count);
-    }
-}
-
-// A row of a colour's single pixels, over what dst holds or in its place.
-void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst, bool over)
-{
-    if (c->colorType == kColorSolid || (c->colorType == kColorGradient && !c->builtRamp)) {
-        RGBI value = c->colorType == kColorSolid ? c->rgb : RGBI();
-        if (over)
-            CompositeRGBSolid(&value, dst, n);
-        else
-            std::fill_n(dst, n, value);
-        return;
-    }
-    U16 index[kPiece];
-    if (c->colorType == kColorGradient)
-        GradientPixelIndices(c, x, n, index);
-    for (S32 i = 0; i < n; ++i) {
-        Lanes value = c->colorType == kColorGradient ? UnpackLanes(c->builtRamp[index[i]])
-                                                     : ToLanes(BitmapPixel(c, x + i));
-        dst[i] = over ? FromLanes(BlendLanes(ToLanes(dst[i]), value)) : FromLanes(value);
     }
 }
