@@ -30,23 +30,34 @@ void CRaster::PaintAARuns()
 
 void CRaster::MakeRun(RRun* run, const RSpan* const* at) const
 {
-    run->kinds = 0;
-    run->isSolid = true;
-    run->sum = 0;
-    for (int i = 0; i < 4; ++i) {
-        U32 stack = at[i]->stack;
-        run->isSolid = run->isSolid && stacks[stack].isSolid;
-        run->sum += stacks[stack].solid;
-        int k = 0;
-        while (k < run->kinds && run->stacks[k] != stack)
-            ++k;
-        if (k == run->kinds) {
-            run->stacks[k] = stack;
-            run->weights[k] = 0;
-            ++run->kinds;
-        }
-        ++run->weights[k];
+    const RStack& first = stacks[at[0]->stack];
+    run->stacks[0] = at[0]->stack;
+    run->weights[0] = 4;
+    run->kinds = 1;
+    run->isSolid = first.isSolid;
+    run->sum = first.solid * 4;
+    U32 s = at[0]->stack;
+    if (s == at[1]->stack && s == at[2]->stack && s == at[3]->stack)
+        return;
+    run->weights[0] = 1;
+    run->sum = first.solid;
+    for (int i = 1; i < 4; ++i)
+        AddToRun(run, at[i]->stack);
+}
+
+void CRaster::AddToRun(RRun* run, U32 stack) const
+{
+    run->isSolid = run->isSolid && stacks[stack].isSolid;
+    run->sum += stacks[stack].solid;
+    int k = 0;
+    while (k < run->kinds && run->stacks[k] != stack)
+        ++k;
+    if (k == run->kinds) {
+        run->stacks[k] = stack;
+        run->weights[k] = 0;
+        ++run->kinds;
     }
+    ++run->weights[k];
 }
 
 void CRaster::PaintRun(const RRun& run)

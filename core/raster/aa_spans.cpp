@@ -8,10 +8,7 @@ void CRaster::BeginRow()
     for (GrowBuffer<RSpan>& line : sublines)
         line.Clear();
     stacks.Clear();
-    RStack nothing = {};
-    nothing.isSolid = true;
-    nothing.pixelX = -1;
-    rowLost = !stacks.Push(nothing);
+    rowLost = !stacks.Push({nullptr, 0, 0, 0, 0, -1, 0, true, false});
 }
 
 void CRaster::RecordSpan(S32 xmax)
@@ -59,20 +56,15 @@ U32 CRaster::FindStack(RColor* top, U32 below)
 
 U32 CRaster::NewStack(RColor* top, U32 below, U32 next)
 {
-    const RStack& base = stacks[below];
-    RStack s = {};
-    s.color = top;
-    s.below = below;
-    s.next = next;
-    s.count = base.count + 1;
-    s.isSolid = base.isSolid && top->colorType == kColorSolid;
-    s.covers = below ? base.covers : !top->transparent;
-    s.solid = BlendLanes(base.solid, ToLanes(top->rgb));
-    s.pixelX = -1;
-    if (!stacks.Push(s)) {
+    if (!stacks.Reserve(stacks.size() + 1)) {
         rowLost = true;
         return 0;
     }
+    const RStack& base = stacks[below];
+    bool isSolid = base.isSolid && top->colorType == kColorSolid;
+    bool covers = below ? base.covers : !top->transparent;
+    Lanes solid = isSolid ? BlendLanes(base.solid, ToLanes(top->rgb)) : 0;
+    stacks.Push({top, solid, 0, below, next, -1, U16(base.count + 1), isSolid, covers});
     U32 made = U32(stacks.size() - 1);
     top->spanRow = rowSerial;
     top->spanStack = made;

@@ -57,6 +57,11 @@ SPOINT GradientPoint(const RColor* color, S32 x)
     return u;
 }
 
+S32 LinearIndex(S32 ux)
+{
+    return std::clamp((ux >> 15) + 128, 0, kLastEntry);
+}
+
 // u.x at pixel x is the x term, exactly floor(a * x / 256), plus what is the same for the whole
 // row; stepping the product before the shift gives each pixel what it has when computed by itself.
 void LinearIndices(const RColor* color, S32 x, S32 n, U16* index)
@@ -67,13 +72,12 @@ void LinearIndices(const RColor* color, S32 x, S32 n, U16* index)
     S64 last = product + S64(a) * n;
     if (product != S32(product) || last != S32(last)) {
         for (S32 i = 0; i < n; ++i, product += a)
-            index[i] = U16(std::clamp((S32(S32(product >> 8) + rest) >> 15) + 128, 0, kLastEntry));
+            index[i] = U16(LinearIndex(S32(product >> 8) + rest));
         return;
     }
     S32 narrow = S32(product);
     for (S32 i = 0; i < n; ++i) {
-        S32 value = (((narrow + a * i) >> 8) + rest) >> 15;
-        index[i] = U16(std::clamp(value + 128, 0, kLastEntry));
+        index[i] = U16(LinearIndex(((narrow + a * i) >> 8) + rest));
     }
 }
 
@@ -82,23 +86,37 @@ S32 RadialIndex(const SPOINT& u)
     return std::min(PointLength(&u) >> 14, kLastEntry);
 }
 
-// The index is a length, and lengths come from a table that is good to 1/8192 at these sizes. So
-// the square of the true length settles the index wherever it is further than that from a ring's
-// border: kSure[i] are the squares between which entry i is certain. Near a border the length
-// itself decides.
-struct SureSquares {
-    U64 low, high;
+// The index is a length, and the length table is good to 1/32768 of it. So the square of the true
+// length settles the index wherever it is further than twice that from a ring's border; near a
+// border the length itself decides.
+struct RingSquares {
+    U64 low, high;   // between these entry i is certain
+    U64 previousEnd; // below this the entry before is certain
+    U64 nextStart;   // from this on the next entry is certain
 };
-SureSquares kSure[kRampEntries];
+RingSquares kRings[kRampEntries];
 
-void BuildSureSquares()
+U64 InnerSquare(U64 i)
+{
+    U64 border = i << 14;
+    border += border / 16384 + 8;
+    return i ? border * border : 0;
+}
+
+U64 OuterSquare(U64 i)
+{
+    U64 border = (i + 1) << 14;
+    border -= border / 16384 + 8;
+    return border * border;
+}
+
+void BuildRingSquares()
 {
     for (U64 i = 0; i < kRampEntries; ++i) {
-        U64 inner = (i << 14) + (i << 14) / 4096 + 64;
-        U64 outer = ((i + 1) << 14) - ((i + 1) << 14) / 4096 - 64;
-        kSure[i] = {inner * inner, i == kLastEntry ? ~U64(0) : outer * outer};
+        bool last = i == kLastEntry;
+        kRings[i] = {InnerSquare(i), last ? ~U64(0) : OuterSquare(i),
+                     i ? OuterSquare(i - 1) + 1 : 0, last ? ~U64(0) : InnerSquare(i + 1)};
     }
-    kSure[0].low = 0;
 }
 
 // u at pixel x + i is the pixel's own product, floored, plus what is the same for the whole row.
@@ -112,11 +130,11 @@ void RadialPixelIndices(const RColor* color, S32 x, S32 n, U16* index)
     for (S32 i = 0; i < n; ++i, ax += a, bx += b) {
         u = {S32(ax >> 8) + restX, S32(bx >> 8) + restY};
         U64 square = U64(S64(u.x) * u.x) + U64(S64(u.y) * u.y);
-        while (at < kLastEntry && square >= kSure[at + 1].low)
-            ++at;
-        while (at > 0 && square <= kSure[at - 1].high)
-            --at;
-        if (square < kSure[at].low || square > kSure[at].high)
+        // Most steps stay or go to a neighbour; written without branches, which would be guessed
+        // wrong.
+        const RingSquares& ring = kRings[at];
+        at += S32(square >= ring.nextStart) - S32(square < ring.previousEnd);
+        if (square < kRings[at].low || square > kRings[at].high)
             at = RadialIndex(u);
         index[i] = U16(at);
     }
@@ -236,7 +254,7 @@ void BuildRenderTables()
         return;
     for (S32 i = 0; i <= kRampEntries; ++i)
         kSquares[i] = U16(std::min(i * i, 65535));
-    BuildSureSquares();
+    BuildRingSquares();
 }
 
 void BuildGradientCache(RColor* color)
@@ -271,5 +289,11 @@ void BuildGradientPixels(const RColor* color, S32 x, S32 n, RGBI* dst)
 
 void CalcGradientPixel(RColor* color, S32 x, RGBI* dst)
 {
-    BuildGradientPixels(color, x, 1, dst);
+    if (!color->builtRamp) {
+        *dst = RGBI();
+        return;
+    }
+    SPOINT u = GradientPoint(color, x);
+    S32 index = color->gradientType == kFillRadial ? RadialIndex(u) : LinearIndex(u.x);
+    *dst = FromLanes(UnpackLanes(color->builtRamp[index]));
 }

@@ -32,14 +32,14 @@ struct RSpan {
 // stacks are one entry, and stacks with the same lower part share it.
 struct RStack {
     RColor* color; // the top
+    Lanes solid;   // their blend, when isSolid
+    Lanes pixel;   // the last pixel computed singly, at pixelX
     U32 below;     // index of the stack under it; 0: nothing
     U32 next;      // older stack of the row with the same top, 0 when none
-    U32 count;     // colours in all
-    bool isSolid;  // all of them are solid: `solid` is their blend
+    S32 pixelX;    // -1: none yet
+    U16 count;     // colours in all
+    bool isSolid;  // all of them are solid
     bool covers;   // the lowest is opaque
-    Lanes solid;
-    S32 pixelX;  // the last pixel computed singly, -1 when none ...
-    Lanes pixel; // ... and its value
 };
 
 // One horizontal run of a pixel row: where its four sub-scanlines show the same four stacks.
@@ -153,6 +153,7 @@ private:
     // aa_runs.cpp: spans merged into runs, runs into pixels
     void PaintAARuns();
     void MakeRun(RRun* run, const RSpan* const* at) const;
+    void AddToRun(RRun* run, U32 stack) const;
     void PaintRun(const RRun& run);
     Lanes CalcColor(const RRun& run, S32 x);
     Lanes StackColor(U32 stack, S32 x);

@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "core/raster/gradient.h"
+#include "core/raster/lanes8.h"
 #include "core/raster/raster.h"
 
 static void DrawNothing(RColor*, S32, S32) {}
@@ -29,16 +30,22 @@ static void CompositeSolidSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
 
 void CompositeRGB(const RGBI* src, RGBI* dst, int n)
 {
-    for (int i = 0; i < n; ++i)
+    int i = 0;
+    for (; i + 2 <= n; i += 2)
+        StorePair(dst + i, BlendPair(LoadPair(dst + i), LoadPair(src + i)));
+    if (i < n)
         dst[i] = FromLanes(BlendLanes(ToLanes(dst[i]), ToLanes(src[i])));
 }
 
 void CompositeRGBSolid(const RGBI* c, RGBI* dst, int n)
 {
-    Lanes src = ToLanes(*c);
-    U32 rest = 256 - LaneAlpha(src);
-    for (int i = 0; i < n; ++i)
-        dst[i] = FromLanes((ToLanes(dst[i]) * rest >> 8 & kLaneMask) + src);
+    RGBI twice[2] = {*c, *c};
+    Lanes8 src = LoadPair(twice);
+    int i = 0;
+    for (; i + 2 <= n; i += 2)
+        StorePair(dst + i, BlendPair(LoadPair(dst + i), src));
+    if (i < n)
+        dst[i] = FromLanes(BlendLanes(ToLanes(dst[i]), ToLanes(*c)));
 }
 
 void CalcSolidPixel(RColor* color, S32, RGBI* dst)
