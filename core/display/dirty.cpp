@@ -4,11 +4,17 @@
 #include "core/display/display_list.h"
 
 namespace {
-// `r` moved outward by d on every side, without wrapping.
+S32 Cut(S64 v)
+{
+    return static_cast<S32>(std::clamp<S64>(v, -kS32Max, kS32Max));
+}
+
+// `r` moved outward by d on every side. The least number stays unused, for it would mean an empty
+// rectangle.
 SRECT Grown(const SRECT* r, S32 d)
 {
-    return {Saturate32(S64{r->xmin} - d), Saturate32(S64{r->xmax} + d),
-            Saturate32(S64{r->ymin} - d), Saturate32(S64{r->ymax} + d)};
+    return {Cut(S64{r->xmin} - d), Cut(S64{r->xmax} + d), Cut(S64{r->ymin} - d),
+            Cut(S64{r->ymax} + d)};
 }
 
 S32 UnionArea(const SRECT* a, const SRECT* b)
