@@ -101,10 +101,11 @@ void SCharacterParser::ChangeFills()
     fillRule = color2 ? kRuleEdge : useWinding ? kRuleWinding : kRuleEvenOdd;
 }
 
-// A mask of several style blocks keeps its one colour through all of them.
+// A mask of several style blocks keeps its one colour through all of them. A shape without fills
+// gets none, and so is no mask: what it would have hidden is drawn.
 void SCharacterParser::MakeClipper()
 {
-    if (!clipColor)
+    if (!clipColor && nFills > 0)
         clipColor = CreateClipColor(display, colorList);
     for (U32 i = 1; i <= nFills; ++i)
         fillIndex[i] = clipColor;
