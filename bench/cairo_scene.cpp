@@ -182,15 +182,20 @@ cairo_pattern_t* CairoScene::PatternOf(const RColor* color) const
                                          color->rgb.blue / a, color->rgb.alpha / 255.0);
     }
     cairo_pattern_t* p = color->gradientType == kFillRadial
-                             ? cairo_pattern_create_radial(0, 0, 0, 0, 0, 16384)
-                             : cairo_pattern_create_linear(-16384, 0, 16384, 0);
+                             ? cairo_pattern_create_radial(0, 0, 0, 0, 0, 1)
+                             : cairo_pattern_create_linear(-1, 0, 1, 0);
     for (int i = 0; i < color->ramp.count; ++i) {
         SRGB s = color->ramp.colors[i];
         cairo_pattern_add_color_stop_rgba(p, color->ramp.ratios[i] / 255.0, s.red / 255.0,
                                           s.green / 255.0, s.blue / 255.0, s.alpha / 255.0);
     }
-    cairo_matrix_t m = ToCairo(color->gradientMat);
-    if (cairo_matrix_invert(&m) == CAIRO_STATUS_SUCCESS)
+    // A matrix that cairo cannot take both ways leaves the plain pattern.
+    cairo_matrix_t m = ToCairo(color->gradientMat), back, unit;
+    cairo_matrix_init_scale(&unit, 16384, 16384); // cairo's own numbers would not hold the square's
+    cairo_matrix_multiply(&m, &unit, &m);
+    bool usable = cairo_matrix_invert(&m) == CAIRO_STATUS_SUCCESS;
+    back = m;
+    if (usable && cairo_matrix_invert(&back) == CAIRO_STATUS_SUCCESS)
         cairo_pattern_set_matrix(p, &m);
     return p;
 }

@@ -19,6 +19,8 @@ public:
     void Draw();
     // Writes the surface as a PNG, to see that it shows the same picture.
     bool Save(const char* path);
+    // What cairo says went wrong, or "no error has occurred".
+    const char* Status() const { return cairo_status_to_string(cairo_status(cr)); }
 
 private:
     struct Item {
