@@ -1,4 +1,6 @@
 // One shape record from any bytes, built and painted under several matrices.
+#include <algorithm>
+
 #include "core/display/display_list.h"
 #include "core/stream/character.h"
 #include "platform/headless/native_player.h"
@@ -7,8 +9,9 @@
 // A movie of one frame whose only shape has the given body.
 static std::vector<U8> MovieAround(const U8* body, size_t size, int tagCode)
 {
-    std::vector<U8> definition = {1, 0, 0}; // id, bounds of no bits
-    definition.insert(definition.end(), body, body + size);
+    std::vector<U8> definition(3 + size); // the id, bounds of no bits, the body
+    definition[0] = 1;
+    std::copy(body, body + size, definition.data() + 3);
     MovieWriter movie(2000, 2000);
     movie.Raw(tagCode, definition).Place(1, 1).Show().End();
     return movie.Bytes();

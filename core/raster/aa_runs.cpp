@@ -202,10 +202,28 @@ void CRaster::PaintMixed(const RRun& run, S32 x, S32 n)
     bool covers = true;
     for (int k = 0; k < run.kinds; ++k)
         covers = covers && stacks[run.stacks[k]].covers;
-    BuildRunRows(run, x, n);
-    if (run.kinds > 1)
+    if (run.kinds == 1) {
+        BuildStackRow(run.stacks[0], x, n);
+    } else {
+        BuildRunRows(run, x, n);
         SumRows(run, n);
+    }
     EmitPixels(x, rows[0], n, covers);
+}
+
+// One stack's pixels in the first row: the lowest colour, then the others over it.
+void CRaster::BuildStackRow(U32 stack, S32 x, S32 n)
+{
+    RColor* list[kMaxCollected];
+    int left = 0;
+    for (U32 s = stack; s; s = stacks[s].below)
+        list[left++] = stacks[s].color;
+    BuildPixelRow(list[--left], x, n, rows[0]);
+    while (left-- > 0) {
+        if (list[left]->colorType != kColorSolid)
+            BuildPixelRow(list[left], x, n, piece);
+        BlendPixelRow(list[left], rows[0], n);
+    }
 }
 
 // Leaves the rows' average over the four sub-scanlines in the first row.
@@ -243,25 +261,28 @@ void CRaster::BuildRunRows(const RRun& run, S32 x, S32 n)
             if (left[k] == 0 || lists[k][left[k] - 1] != lowest)
                 continue;
             --left[k];
-            if (!built)
-                BuildPixelRow(lowest, x, n);
+            if (!built && lowest->colorType != kColorSolid)
+                BuildPixelRow(lowest, x, n, piece);
             built = true;
             BlendPixelRow(lowest, rows[k], n);
         }
     }
 }
 
-// A colour's pixels from x on, each as if computed singly, in `piece`; a solid colour needs none.
-void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n)
+// A colour's pixels from x on, each as if computed singly.
+void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst)
 {
     if (c->colorType == kColorGradient) {
-        BuildGradientPixels(c, x, n, piece);
-        return;
+        BuildGradientPixels(c, x, n, dst);
+    } else if (c->colorType == kColorSolid) {
+        std::fill_n(dst, n, c->rgb);
+    } else {
+        for (S32 i = 0; i < n; ++i)
+            CalcBitmapPixel(c, x + i, &dst[i]);
     }
-    for (S32 i = 0; i < n && c->colorType == kColorBitmap; ++i)
-        CalcBitmapPixel(c, x + i, &piece[i]);
 }
 
+// Blends what `piece` holds, or a solid colour, over a row.
 void CRaster::BlendPixelRow(RColor* c, RGBI* row, S32 n)
 {
     if (c->colorType == kColorSolid)

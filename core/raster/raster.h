@@ -167,7 +167,8 @@ private:
     void PaintFlat(Lanes value, S32 x0, S32 x1);
     void PaintMixed(const RRun& run, S32 x, S32 n);
     void BuildRunRows(const RRun& run, S32 x, S32 n);
-    void BuildPixelRow(RColor* c, S32 x, S32 n);
+    void BuildStackRow(U32 stack, S32 x, S32 n);
+    void BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst);
     void BlendPixelRow(RColor* c, RGBI* row, S32 n);
     void SumRows(const RRun& run, S32 n);
 
