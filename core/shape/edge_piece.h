@@ -20,9 +20,10 @@ enum EPieceFate {
 // True when the three points lie within kEdgeReach of both axes.
 inline bool PieceFits(const CURVE& c)
 {
-    const auto inside = [](S32 v) { return U32(v) + U32(kEdgeReach) <= U32(2 * kEdgeReach); };
-    return inside(c.anchor1.x) & inside(c.anchor1.y) & inside(c.control.x) & inside(c.control.y) &
-           inside(c.anchor2.x) & inside(c.anchor2.y);
+    // Numbers rather than truths: one test for all six.
+    const auto inside = [](S32 v) { return int(U32(v) + U32(kEdgeReach) <= U32(2 * kEdgeReach)); };
+    return (inside(c.anchor1.x) & inside(c.anchor1.y) & inside(c.control.x) & inside(c.control.y) &
+            inside(c.anchor2.x) & inside(c.anchor2.y)) != 0;
 }
 
 // Decides about a y-monotonic piece that may not fit. One that lies wholly left or right of all
