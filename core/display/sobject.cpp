@@ -1,6 +1,4 @@
 // The object tree: change tracking, bounds, and the end of an object.
-#include <algorithm>
-
 #include "core/display/sobject.h"
 
 #include "core/display/display_list.h"
@@ -45,14 +43,13 @@ void SObject::Recalculate(const MATRIX* mat)
     dirty = 0;
 }
 
-// A mask in the range may reach further up than the range itself.
+// A mask in the range that reaches beyond it is drawn itself, and what it masks shows inside it
+// only.
 void SObject::InvalidateRemasked()
 {
     for (SObject* child = bottomChild; child && child->depth <= remaskTo; child = child->above) {
-        if (child->depth < remaskFrom)
-            continue;
-        child->InvalidateDrawn();
-        remaskTo = std::max(remaskTo, child->clipDepth);
+        if (child->depth >= remaskFrom)
+            child->InvalidateDrawn();
     }
     remaskFrom = remaskTo = 0;
 }

@@ -47,6 +47,22 @@ TEST(Paint, OnlyDirtyPixelsAreTouched)
     EXPECT_EQ(s.list.nDirty, 0);
 }
 
+// What stands a pixel out of its bounds belongs to a repaint beside the bounds too.
+TEST(Paint, OverhangSurvivesARepaintBesideIt)
+{
+    for (const bool smooth : {false, true}) {
+        MovieWriter movie(100 * 20, 100 * 20);
+        movie.DefineShape(1, 32, {0, 18 * 20, 0, 18 * 20}, Square(kRed, 20)).Show();
+        Scene s(movie, 100, 100, smooth);
+        s.Place(5, 1, AtPixel(10, 10));
+        EXPECT_EQ(s.Pixel(28, 15), kRedPixel);
+        const S32 unit = smooth ? 4 : 1;
+        const SRECT beside = {30 * unit, 40 * unit, 0, 40 * unit};
+        s.list.InvalidateRect(&beside);
+        EXPECT_EQ(s.Pixel(28, 15), kRedPixel);
+    }
+}
+
 TEST(Paint, HiddenMeansAllBelow)
 {
     Scene s(Cast(), 100, 100);
@@ -93,6 +109,24 @@ TEST(Paint, MasksAndTheirRange)
         EXPECT_EQ(s.Pixel(50, 50), kGreenPixel);
         EXPECT_EQ("", ExpectSame(s.Shown(), s.Repainted(), "masks"));
     }
+}
+
+// The inner mask reaches beyond the outer one's range and takes the outer one's clip along.
+TEST(Paint, AnInnerMaskReachesFurther)
+{
+    MovieWriter movie = Cast();
+    movie.DefineShape(5, Square(kGreen, 60)).DefineShape(6, Square(kBlue, 60)).Show();
+    Scene s(movie, 100, 100);
+    s.player.Seek(1);
+    s.Place(3, 1, {}, 7);
+    s.Place(5, 5, {}, 12);
+    s.Place(10, 6);
+    EXPECT_EQ(s.Pixel(5, 5), kBluePixel);
+    EXPECT_EQ(s.Pixel(50, 50), kWhitePixel);
+    s.Remove(3);
+    EXPECT_EQ(s.Pixel(50, 50), kBluePixel);
+    s.Place(3, 1, {}, 7);
+    EXPECT_EQ(s.Pixel(50, 50), kWhitePixel);
 }
 
 // Without colours there is no mask: what it ought to hide shows, but is not hit.
