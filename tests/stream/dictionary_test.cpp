@@ -1,4 +1,3 @@
-#include "core/player/limits.h"
 #include "core/stream/script_player.h"
 #include "core/stream/tags.h"
 #include "tests/stream/stream_scene.h"
@@ -75,19 +74,6 @@ TEST(Dictionary, RecordsOutliveTheirDefinitionWhileInUse)
     SCharacter* own = movie.NewPrivateCharacter();
     RetainCharacter(own);
     ReleaseCharacter(own);
-}
-
-TEST(Dictionary, IsBounded)
-{
-    const SLimits saved = gLimits;
-    gLimits.characters = 3;
-    ScriptPlayer movie;
-    for (U16 id = 1; id <= 3; id++)
-        EXPECT_NE(movie.CreateCharacter(id), nullptr);
-    EXPECT_EQ(movie.CreateCharacter(4), nullptr);
-    movie.FreeCharacter(U16(2));
-    EXPECT_NE(movie.CreateCharacter(4), nullptr);
-    gLimits = saved;
 }
 
 TEST(Definitions, KeepTypeCodeBoundsAndBody)
@@ -222,24 +208,6 @@ TEST(Definitions, BodiesThatAreTooShortKeepNothing)
             }
         }
     }
-}
-
-TEST(Definitions, AreNotRepeatedByASecondRun)
-{
-    MovieWriter writer;
-    writer.DefineShape(3, ShapeBuilder().Rect(0, 0, 20, 20)).Raw(14, Body(5, {0x4F, 0, 0, 0, 0}));
-    const auto movie = RunTags(writer);
-    const SCharacter* shape = movie->FindCharacter(3);
-    movie->pos = movie->startPos;
-    movie->atEnd = false;
-    while (movie->DoTag() == kDrawn) {
-    }
-    EXPECT_EQ(movie->FindCharacter(3), shape);
-    EXPECT_EQ(movie->FindCharacter(5), nullptr);
-    movie->FreeAll();
-    EXPECT_EQ(movie->FindCharacter(3), nullptr);
-    EXPECT_EQ(movie->pos, movie->startPos);
-    EXPECT_EQ(movie->CountFrames(), 1) << "the bytes stay";
 }
 
 } // namespace

@@ -24,7 +24,8 @@ TEST(Place, TagsCarryTheirParts)
     writer.Place2(4, {.character = 1, .matrix = mat, .cx = Cx::Multiply(1, 2, 3, 4), .ratio = 777});
     writer.Place2(5, {.character = 99, .matrix = mat}).Place2(6, {.matrix = mat});
     writer.Place2(7, {.character = 1, .clipDepth = 9}).Place2(8, {.character = 2});
-    writer.Place2(4, {.move = true, .ratio = 778}).Place(0xFFFE, 20).Show().End();
+    writer.Place2(4, {.move = true, .ratio = 778}).Place(0xFFFE, 20);
+    writer.Background({10, 20, 30}).Background({1, 2, 3}).Show().End();
     StreamScene scene(writer);
     scene.Tick();
     EXPECT_EQ(scene.Tree(), "1:1@-70 2:1@-70 4:1@-70 7:1 8:2(1:1)")
@@ -37,6 +38,7 @@ TEST(Place, TagsCarryTheirParts)
     EXPECT_EQ(scene.At(7)->clipDepth, 9);
     EXPECT_EQ(scene.At(1)->name, nullptr);
     EXPECT_STREQ(scene.At(8)->name, "instance1");
+    EXPECT_EQ(scene.list.backgroundColor, (SRGB{10, 20, 30, 255}));
 }
 
 TEST(Place, AClipDepthAfterANameIsReadFromTheName)
@@ -51,24 +53,6 @@ TEST(Place, AClipDepthAfterANameIsReadFromTheName)
     EXPECT_EQ(scene.At(1)->clipDepth, 0x6261);
     EXPECT_EQ(scene.At(2)->clipDepth, 0x3400) << "the zero, then the first byte of what follows";
     EXPECT_EQ(scene.At(3)->clipDepth, 0);
-}
-
-TEST(Place, TheCloneMarkCannotComeFromAFile)
-{
-    MovieWriter writer = Start();
-    writer.Raw(26, ByteWriter().PutU8(0x82).PutU16(3).PutU16(2).Bytes()).Show().End();
-    StreamScene scene(writer);
-    scene.Tick();
-    EXPECT_EQ(scene.Tree(), "3:2(1:1)");
-}
-
-TEST(Place, BackgroundIsTheFirstOne)
-{
-    MovieWriter writer = Start();
-    writer.Background({10, 20, 30}).Background({1, 2, 3}).Show().End();
-    StreamScene scene(writer);
-    scene.Tick();
-    EXPECT_EQ(scene.list.backgroundColor, (SRGB{10, 20, 30, 255}));
 }
 
 TEST(Place, CharactersFreedWhileShownStayOnScreen)
