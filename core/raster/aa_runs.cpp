@@ -110,8 +110,8 @@ Lanes CRaster::PixelColor(RColor* c, S32 x)
 {
     static constexpr RPixelProc kPixelProcs[] = {CalcSolidPixel, CalcBitmapPixel,
                                                  CalcGradientPixel};
-    if (c->colorType == kColorSolid)
-        return ToLanes(c->rgb);
+    if (c->flatRow)
+        return c->flatValue;
     U32 key = U32(rowY) << 16 | (U32(x) & 0xFFFF);
     if (!c->pixValid || c->pixKey != key) {
         kPixelProcs[c->colorType](c, x, &c->pixValue);
@@ -220,7 +220,7 @@ void CRaster::BuildStackRow(U32 stack, S32 x, S32 n)
         list[left++] = stacks[s].color;
     BuildPixelRow(list[--left], x, n, rows[0]);
     while (left-- > 0) {
-        if (list[left]->colorType != kColorSolid)
+        if (!list[left]->flatRow)
             BuildPixelRow(list[left], x, n, piece);
         BlendPixelRow(list[left], rows[0], n);
     }
@@ -261,7 +261,7 @@ void CRaster::BuildRunRows(const RRun& run, S32 x, S32 n)
             if (left[k] == 0 || lists[k][left[k] - 1] != lowest)
                 continue;
             --left[k];
-            if (!built && lowest->colorType != kColorSolid)
+            if (!built && !lowest->flatRow)
                 BuildPixelRow(lowest, x, n, piece);
             built = true;
             BlendPixelRow(lowest, rows[k], n);
@@ -272,21 +272,22 @@ void CRaster::BuildRunRows(const RRun& run, S32 x, S32 n)
 // A colour's pixels from x on, each as if computed singly.
 void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst)
 {
-    if (c->colorType == kColorGradient) {
+    if (c->flatRow) {
+        std::fill_n(dst, n, FromLanes(c->flatValue));
+    } else if (c->colorType == kColorGradient) {
         BuildGradientPixels(c, x, n, dst);
-    } else if (c->colorType == kColorSolid) {
-        std::fill_n(dst, n, c->rgb);
     } else {
         for (S32 i = 0; i < n; ++i)
             CalcBitmapPixel(c, x + i, &dst[i]);
     }
 }
 
-// Blends what `piece` holds, or a solid colour, over a row.
+// Blends what `piece` holds, or the row's only colour, over a row.
 void CRaster::BlendPixelRow(RColor* c, RGBI* row, S32 n)
 {
-    if (c->colorType == kColorSolid)
-        CompositeRGBSolid(&c->rgb, row, n);
+    RGBI flat = FromLanes(c->flatValue);
+    if (c->flatRow)
+        CompositeRGBSolid(&flat, row, n);
     else
         CompositeRGB(piece, row, n);
 }

@@ -1,5 +1,6 @@
 // Anti-aliasing, first half: four sub-scanlines of a pixel row are recorded as spans of colour
 // stacks.
+#include "core/raster/gradient.h"
 #include "core/raster/raster.h"
 
 void CRaster::BeginRow()
@@ -46,12 +47,27 @@ U32 CRaster::InternStack(int count)
 // Only a few are compared: a stack that is entered twice costs time, never a wrong pixel.
 U32 CRaster::FindStack(RColor* top, U32 below)
 {
-    U32 newest = top->spanRow == rowSerial ? top->spanStack : 0;
+    if (top->spanRow != rowSerial)
+        EnterRow(top);
     int tries = 16;
-    for (U32 i = newest; i && tries-- > 0; i = stacks[i].next)
+    for (U32 i = top->spanStack; i && tries-- > 0; i = stacks[i].next)
         if (stacks[i].below == below)
             return i;
-    return NewStack(top, below, newest);
+    return NewStack(top, below, top->spanStack);
+}
+
+// The first time that a colour is seen in a pixel row. Gradients that run down the picture have one
+// colour in each row and then cost no more than solid ones.
+void CRaster::EnterRow(RColor* c)
+{
+    c->spanRow = rowSerial;
+    c->spanStack = 0;
+    c->flatValue = ToLanes(c->rgb);
+    c->flatRow = c->colorType == kColorSolid;
+    if (c->colorType == kColorGradient) {
+        rowY = y >> 2;
+        c->flatRow = GradientIsFlat(c, area.xmin, area.xmax, &c->flatValue);
+    }
 }
 
 U32 CRaster::NewStack(RColor* top, U32 below, U32 next)
@@ -61,12 +77,11 @@ U32 CRaster::NewStack(RColor* top, U32 below, U32 next)
         return 0;
     }
     const RStack& base = stacks[below];
-    bool isSolid = base.isSolid && top->colorType == kColorSolid;
+    bool isSolid = base.isSolid && top->flatRow;
     bool covers = below ? base.covers : !top->transparent;
-    Lanes solid = isSolid ? BlendLanes(base.solid, ToLanes(top->rgb)) : 0;
+    Lanes solid = isSolid ? BlendLanes(base.solid, top->flatValue) : 0;
     stacks.Push({top, solid, 0, below, next, -1, U16(base.count + 1), isSolid, covers});
     U32 made = U32(stacks.size() - 1);
-    top->spanRow = rowSerial;
     top->spanStack = made;
     return made;
 }

@@ -297,3 +297,18 @@ void CalcGradientPixel(RColor* color, S32 x, RGBI* dst)
     S32 index = color->gradientType == kFillRadial ? RadialIndex(u) : LinearIndex(u.x);
     *dst = FromLanes(UnpackLanes(color->builtRamp[index]));
 }
+
+// The index never turns back along a row, so both ends tell.
+bool GradientIsFlat(const RColor* color, S32 x0, S32 x1, Lanes* value)
+{
+    if (color->gradientType == kFillRadial || !color->builtRamp || x0 >= x1)
+        return false;
+    S64 a = color->gradientInv.a;
+    S64 first = a * x0 >> 8, last = a * (x1 - 1) >> 8;
+    S64 rest = S64(GradientPoint(color, x0).x) - S32(first);
+    if (first + rest != S32(first + rest) || last + rest != S32(last + rest))
+        return false;
+    S32 index = LinearIndex(S32(first + rest));
+    *value = UnpackLanes(color->builtRamp[index]);
+    return index == LinearIndex(S32(last + rest));
+}

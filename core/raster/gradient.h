@@ -10,3 +10,7 @@ void BuildGradientCache(RColor* color);
 // n pixels of a gradient colour from x in the raster's current row, each with the value that it has
 // when computed singly.
 void BuildGradientPixels(const RColor* color, S32 x, S32 n, RGBI* dst);
+
+// The pixels x0..x1 of the raster's current row all have one colour, `value`. Never true for a
+// radial gradient.
+bool GradientIsFlat(const RColor* color, S32 x0, S32 x1, Lanes* value);

@@ -38,7 +38,7 @@ struct RStack {
     U32 next;      // older stack of the row with the same top, 0 when none
     S32 pixelX;    // -1: none yet
     U16 count;     // colours in all
-    bool isSolid;  // all of them are solid
+    bool isSolid;  // all of them have one colour in the whole row
     bool covers;   // the lowest is opaque
 };
 
@@ -148,6 +148,7 @@ private:
     void EndSubline();
     U32 InternStack(int count);
     U32 FindStack(RColor* top, U32 below);
+    void EnterRow(RColor* c);
     U32 NewStack(RColor* top, U32 below, U32 next);
 
     // aa_runs.cpp: spans merged into runs, runs into pixels

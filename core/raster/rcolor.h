@@ -46,11 +46,13 @@ struct RColor {
     RGBI rgb;     // the solid value, premultiplied
     U32 rgbPixel; // the same as a pixel of the output format
 
-    U32 pixKey;    // y << 16 | (x & 0xFFFF) of the last pixel computed singly for anti-aliasing
-    U8 pixValid;   // pixKey and pixValue hold something
-    RGBI pixValue; // that pixel's colour
-    U32 spanRow;   // the raster's row serial in which spanStack was set
-    U32 spanStack; // the raster's newest span stack with this colour on top, in that row
+    U32 pixKey;      // y << 16 | (x & 0xFFFF) of the last pixel computed singly for anti-aliasing
+    U8 pixValid;     // pixKey and pixValue hold something
+    RGBI pixValue;   // that pixel's colour
+    U32 spanRow;     // the raster's row serial that the following three belong to
+    U32 spanStack;   // the raster's newest span stack with this colour on top, in that row
+    U8 flatRow;      // every pixel of the row's painted part has one colour ...
+    Lanes flatValue; // ... this one
 
     U8 gradientType;    // kFillRadial, or anything else with 0x10 for linear
     MATRIX gradientMat; // gradient square to shape
