@@ -5,11 +5,16 @@
 
 void CRaster::BeginRow()
 {
-    ++rowSerial;
+    if (++rowSerial == 0) { // all slots look filled after the count has gone round
+        stackIndex.Clear();
+        rowSerial = 1;
+    }
+    rowColors = 0;
+    lastCount = 0;
     for (GrowBuffer<RSpan>& line : sublines)
         line.Clear();
     stacks.Clear();
-    rowLost = !stacks.Push({nullptr, 0, 0, 0, 0, -1, 0, true, false});
+    rowLost = !stacks.Push({nullptr, 0, 0, 0, -1, 0, true, false});
 }
 
 void CRaster::RecordSpan(S32 xmax)
@@ -34,26 +39,63 @@ void CRaster::EndSubline()
         PushSpan(areaDev.xmax, 0);
 }
 
-// The row's stack with the collected colours, found or made from the lowest up.
+// The row's stack with the collected colours. Neighbouring spans mostly differ in one colour, so
+// the part below it is taken from the last one.
 U32 CRaster::InternStack(int count)
 {
     U32 stack = 0;
-    for (int i = count - 1; i >= 0; --i)
-        stack = FindStack(collected[i], stack);
+    bool shared = true;
+    for (int i = 0; i < count; ++i) {
+        RColor* c = collected[count - 1 - i];
+        shared = shared && i < lastCount && lastColors[i] == c;
+        stack = shared ? lastStacks[i] : FindStack(c, stack);
+        lastColors[i] = c;
+        lastStacks[i] = stack;
+    }
+    lastCount = count;
     work += U64(count);
     return stack;
 }
 
-// Only a few are compared: a stack that is entered twice costs time, never a wrong pixel.
+// One stack, one entry: whether sub-scanlines show the same is told by their numbers.
 U32 CRaster::FindStack(RColor* top, U32 below)
 {
     if (top->spanRow != rowSerial)
         EnterRow(top);
-    int tries = 16;
-    for (U32 i = top->spanStack; i && tries-- > 0; i = stacks[i].next)
-        if (stacks[i].below == below)
-            return i;
-    return NewStack(top, below, top->spanStack);
+    if (stacks.size() * 2 > stackIndex.size() && !GrowIndex()) {
+        rowLost = true;
+        return 0;
+    }
+    RStackSlot* slot = FindSlot(top, below);
+    if (slot->row != rowSerial)
+        *slot = {rowSerial, NewStack(top, below)};
+    return slot->stack;
+}
+
+// The slot of that stack, or the free one where it belongs.
+RStackSlot* CRaster::FindSlot(const RColor* top, U32 below)
+{
+    U32 hash = below * 0x9E3779B1u + top->rowNumber * 0x85EBCA6Bu;
+    size_t mask = stackIndex.size() - 1;
+    for (size_t i = (hash ^ hash >> 15) & mask;; i = (i + 1) & mask) {
+        RStackSlot& slot = stackIndex[i];
+        if (slot.row != rowSerial)
+            return &slot;
+        if (stacks[slot.stack].color == top && stacks[slot.stack].below == below)
+            return &slot;
+    }
+}
+
+// Doubles the table and enters the row's stacks again.
+bool CRaster::GrowIndex()
+{
+    size_t size = stackIndex.size() ? stackIndex.size() * 2 : 256;
+    stackIndex.Clear();
+    if (!stackIndex.Resize(size))
+        return false;
+    for (U32 i = 1; i < stacks.size(); ++i)
+        *FindSlot(stacks[i].color, stacks[i].below) = {rowSerial, i};
+    return true;
 }
 
 // The first time that a colour is seen in a pixel row. Gradients that run down the picture have one
@@ -61,7 +103,7 @@ U32 CRaster::FindStack(RColor* top, U32 below)
 void CRaster::EnterRow(RColor* c)
 {
     c->spanRow = rowSerial;
-    c->spanStack = 0;
+    c->rowNumber = rowColors++;
     c->flatValue = ToLanes(c->rgb);
     c->flatRow = c->colorType == kColorSolid;
     if (c->colorType == kColorGradient) {
@@ -70,7 +112,7 @@ void CRaster::EnterRow(RColor* c)
     }
 }
 
-U32 CRaster::NewStack(RColor* top, U32 below, U32 next)
+U32 CRaster::NewStack(RColor* top, U32 below)
 {
     if (!stacks.Reserve(stacks.size() + 1)) {
         rowLost = true;
@@ -80,8 +122,6 @@ U32 CRaster::NewStack(RColor* top, U32 below, U32 next)
     bool isSolid = base.isSolid && top->flatRow;
     bool covers = below ? base.covers : !top->transparent;
     Lanes solid = isSolid ? BlendLanes(base.solid, top->flatValue) : 0;
-    stacks.Push({top, solid, 0, below, next, -1, U16(base.count + 1), isSolid, covers});
-    U32 made = U32(stacks.size() - 1);
-    top->spanStack = made;
-    return made;
+    stacks.Push({top, solid, 0, below, -1, U16(base.count + 1), isSolid, covers});
+    return U32(stacks.size() - 1);
 }

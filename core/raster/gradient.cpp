@@ -119,25 +119,51 @@ void BuildRingSquares()
     }
 }
 
-// u at pixel x + i is the pixel's own product, floored, plus what is the same for the whole row.
-void RadialPixelIndices(const RColor* color, S32 x, S32 n, U16* index)
-{
-    S64 a = color->gradientInv.a, b = color->gradientInv.b;
-    S64 ax = a * x, bx = b * x;
-    SPOINT u = GradientPoint(color, x);
-    S32 restX = u.x - S32(ax >> 8), restY = u.y - S32(bx >> 8);
-    S32 at = RadialIndex(u);
-    for (S32 i = 0; i < n; ++i, ax += a, bx += b) {
-        u = {S32(ax >> 8) + restX, S32(bx >> 8) + restY};
+// Walks single pixels of a row: u at a pixel is the pixel's own product, floored, plus what is the
+// same for the whole row.
+class RingWalk {
+public:
+    RingWalk(const RColor* color, S32 x) : a(color->gradientInv.a), b(color->gradientInv.b)
+    {
+        SPOINT u = GradientPoint(color, x);
+        ax = a * x;
+        bx = b * x;
+        restX = u.x - S32(ax >> 8);
+        restY = u.y - S32(bx >> 8);
+        at = RadialIndex(u);
+    }
+
+    // Most steps stay or go to a neighbour; written without branches, which would be guessed wrong.
+    U16 Next()
+    {
+        SPOINT u = {S32(ax >> 8) + restX, S32(bx >> 8) + restY};
+        ax += a;
+        bx += b;
         U64 square = U64(S64(u.x) * u.x) + U64(S64(u.y) * u.y);
-        // Most steps stay or go to a neighbour; written without branches, which would be guessed
-        // wrong.
         const RingSquares& ring = kRings[at];
         at += S32(square >= ring.nextStart) - S32(square < ring.previousEnd);
         if (square < kRings[at].low || square > kRings[at].high)
             at = RadialIndex(u);
-        index[i] = U16(at);
+        return U16(at);
     }
+
+private:
+    S64 a, b, ax, bx;
+    S32 restX, restY, at;
+};
+
+// Two halves at once: each step waits for the one before it, so one walk alone leaves the machine
+// idle.
+void RadialPixelIndices(const RColor* color, S32 x, S32 n, U16* index)
+{
+    S32 half = n / 2;
+    RingWalk left(color, x), right(color, x + half);
+    for (S32 i = 0; i < half; ++i) {
+        index[i] = left.Next();
+        index[half + i] = right.Next();
+    }
+    if (n & 1)
+        index[n - 1] = right.Next();
 }
 
 void UnpackRamp(const RColor* color, const U16* index, S32 n, RGBI* dst)

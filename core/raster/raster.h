@@ -35,11 +35,16 @@ struct RStack {
     Lanes solid;   // their blend, when isSolid
     Lanes pixel;   // the last pixel computed singly, at pixelX
     U32 below;     // index of the stack under it; 0: nothing
-    U32 next;      // older stack of the row with the same top, 0 when none
     S32 pixelX;    // -1: none yet
     U16 count;     // colours in all
     bool isSolid;  // all of them have one colour in the whole row
     bool covers;   // the lowest is opaque
+};
+
+// A place of the table in which a row's stacks are found by top colour and stack below.
+struct RStackSlot {
+    U32 row;   // the row serial that it was filled in; another one: free
+    U32 stack; // index of the RStack
 };
 
 // One horizontal run of a pixel row: where its four sub-scanlines show the same four stacks.
@@ -148,8 +153,10 @@ private:
     void EndSubline();
     U32 InternStack(int count);
     U32 FindStack(RColor* top, U32 below);
+    RStackSlot* FindSlot(const RColor* top, U32 below);
+    bool GrowIndex();
+    U32 NewStack(RColor* top, U32 below);
     void EnterRow(RColor* c);
-    U32 NewStack(RColor* top, U32 below, U32 next);
 
     // aa_runs.cpp: spans merged into runs, runs into pixels
     void PaintAARuns();
@@ -199,10 +206,15 @@ private:
 
     U32 rowSerial = 0; // of the pixel row whose spans are being recorded
     GrowBuffer<RSpan> sublines[4];
-    GrowBuffer<RStack> stacks; // entry 0 is the empty stack
-    bool rowLost = false;      // memory ran out: the row stays unpainted
-    S32 coverX = 0;            // pixel being accumulated ...
-    Lanes cover = 0;           // ... and its sum
+    GrowBuffer<RStack> stacks;         // entry 0 is the empty stack
+    GrowBuffer<RStackSlot> stackIndex; // a power of two of places, at most half of them filled
+    U32 rowColors = 0;                 // colours met in the row
+    int lastCount = 0;                 // the span recorded last: its colours from the lowest up ...
+    RColor* lastColors[kMaxCollected];
+    U32 lastStacks[kMaxCollected]; // ... and the stacks that end with each
+    bool rowLost = false;          // memory ran out: the row stays unpainted
+    S32 coverX = 0;                // pixel being accumulated ...
+    Lanes cover = 0;               // ... and its sum
     bool covering = false;
     S32 pendingX = 0; // finished pixels that wait to be written side by side
     S32 pendingCount = 0;

@@ -50,7 +50,7 @@ struct RColor {
     U8 pixValid;     // pixKey and pixValue hold something
     RGBI pixValue;   // that pixel's colour
     U32 spanRow;     // the raster's row serial that the following three belong to
-    U32 spanStack;   // the raster's newest span stack with this colour on top, in that row
+    U32 rowNumber;   // how many colours the raster had met in that row before this one
     U8 flatRow;      // every pixel of the row's painted part has one colour ...
     Lanes flatValue; // ... this one
 
