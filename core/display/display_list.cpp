@@ -53,9 +53,11 @@ DisplayList::~DisplayList()
 void DisplayList::ResetBudget()
 {
     tagsLeft = gLimits.tagsPerDraw;
+    recordsLeft = gLimits.shapeRecords;
     edgeAlloc.SetBudget(Blocks(gLimits.liveEdges, kEdgesPerBlock));
     objectAlloc.SetBudget(Blocks(gLimits.liveObjects, kObjectsPerBlock));
     colorAlloc.SetBudget(Blocks(gLimits.liveColors, kColorsPerBlock));
+    raster.SetRampBudget(gLimits.liveRamps);
 }
 
 void DisplayList::UpdateDevViewRect()
@@ -146,6 +148,7 @@ void DisplayList::FreeCache()
 
 SObject* DisplayList::HitTest(const SPOINT* pt)
 {
+    recordsLeft = gLimits.shapeRecords;
     SObject* hit = nullptr;
     root.HitTest(hit, {camera, cameraCxform}, pt);
     return hit;

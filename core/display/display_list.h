@@ -80,7 +80,8 @@ public:
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes the sounds of buttons
     int editTextFlag = 0;          // some text field draws with a device font
-    U32 tagsLeft = 0;              // tags that may still run in this tick; see ResetBudget
+    U32 recordsLeft = 0; // shape records and styles that this repaint or hit test may read
+    U32 tagsLeft = 0;    // tags that may still run in this tick; see ResetBudget
 
     ChunkAlloc edgeAlloc;
     ChunkAlloc objectAlloc;

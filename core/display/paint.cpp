@@ -2,6 +2,7 @@
 #include <algorithm>
 
 #include "core/display/display_list.h"
+#include "core/player/limits.h"
 #include "core/shape/character_parser.h"
 
 namespace {
@@ -55,6 +56,7 @@ void DisplayList::UpdateRect(const SRECT* r)
 {
     if (!bits || !bits->HasBits() || r->xmin >= r->xmax || r->ymin >= r->ymax)
         return;
+    recordsLeft = gLimits.shapeRecords;
     RColor background = {}, focus = {};
     REdge edges[2];
     REdge* bars = nullptr;

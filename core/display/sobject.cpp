@@ -75,19 +75,24 @@ void SObject::CalcDevBounds(const MATRIX* mat)
 }
 
 // Kept apart from Draw: the parser's tables would stand on the stack once per level of the tree.
+// Half a shape would bleed over the picture, so one that the budget cuts short is not drawn at all.
 void SObject::BuildEdges(const STransform* placed)
 {
-    if (edges || colors || !character || character->type != kCharShape)
+    if (built || !character || character->type != kCharShape || display->recordsLeft == 0)
         return;
     SCharacterParser parser(this, character->player, character->data, character->DataLen(), 0,
                             &placed->mat);
     parser.getAlpha = character->tagCode == kTagDefineShape3;
     parser.cxform = placed->cxform;
     parser.BuildEdges(true, &devBounds);
+    built = display->recordsLeft != 0;
+    if (!built)
+        FreeCache();
 }
 
 void SObject::FreeCache()
 {
+    built = 0;
     display->FreeEdges(edges);
     edges = nullptr;
     while (colors) {

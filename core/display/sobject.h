@@ -48,6 +48,7 @@ struct SObject {
     REdge* edges;          // cached, device units
     RColor* colors;        // of those edges
     EditText* editText;    // of a text field, owned
+    U8 built;              // edges and colours are those of the shape, even when there are none
     U32 serial;            // never the same for two objects of one list: tells a recycled record
     U16 nesting;           // number of parents
     U16 remaskFrom; // children of these depths were masked anew since the last recalculation: they

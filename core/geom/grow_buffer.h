@@ -61,6 +61,13 @@ public:
     void Truncate(size_t n) { count = n < count ? n : count; }
     // Drops all elements and keeps the memory.
     void Clear() { count = 0; }
+    // Drops all elements and the memory.
+    void Release()
+    {
+        std::free(items);
+        items = nullptr;
+        count = capacity = 0;
+    }
 
     T* data() { return items; }
     const T* data() const { return items; }

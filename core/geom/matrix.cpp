@@ -123,20 +123,20 @@ void MatrixConcat(const MATRIX* m1, const MATRIX* m2, MATRIX* dst)
     dst->ty = FixedMul(m.ty, n.d) + n.ty + FixedMul(m.tx, n.b);
 }
 
-void MatrixInvert(const MATRIX* m, MATRIX* dst)
+bool MatrixInvert(const MATRIX* m, MATRIX* dst)
 {
     const MATRIX src = *m;
     MatrixIdentity(dst);
     if ((src.a | src.b | src.c | src.d) == 0)
-        return;
+        return false;
     if ((src.b | src.c) == 0) {
         InvertScales(src, dst);
-        return;
+        return true;
     }
     const int shift = DeterminantShift(src);
     const S32 det = Determinant(src, shift);
     if (det == 0)
-        return;
+        return false;
     const int q = 16 - shift;
     dst->a = InverseEntry(src.d, q, det);
     dst->b = -InverseEntry(src.b, q, det);
@@ -144,6 +144,7 @@ void MatrixInvert(const MATRIX* m, MATRIX* dst)
     dst->d = InverseEntry(src.a, q, det);
     dst->tx = -(FixedMul(dst->a, src.tx) + FixedMul(src.ty, dst->c));
     dst->ty = -(FixedMul(dst->d, src.ty) + FixedMul(src.tx, dst->b));
+    return true;
 }
 
 void MatrixMap(const SRECT* src, const SRECT* dst, MATRIX* m)

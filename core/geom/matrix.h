@@ -51,10 +51,10 @@ void MatrixTransformRect(const MATRIX* m, const SRECT* r, SRECT* dst);
 // m1 followed by m2.
 void MatrixConcat(const MATRIX* m1, const MATRIX* m2, MATRIX* dst);
 
-// The inverse, or the identity when there is none. Without skews each scale is inverted alone (0
-// stays 0). With skews it is right when the largest of |a| to |d| is below 2^22 or at least 2^29,
-// and deliberately distorted in between: pictures depend on exactly these numbers.
-void MatrixInvert(const MATRIX* m, MATRIX* dst);
+// The inverse, or the identity (and false) when there is none. Without skews each scale is inverted
+// alone (0 stays 0). With skews it is right when the largest of |a| to |d| is below 2^22 or at
+// least 2^29, and deliberately distorted in between: pictures depend on exactly these numbers.
+bool MatrixInvert(const MATRIX* m, MATRIX* dst);
 
 // Scale and translation that take src onto dst. x is anchored at the minimum edges, y deliberately
 // at the maximum edges.

@@ -17,7 +17,13 @@ struct SLimits {
     // Edges alive in one display list: all that is cached for drawing. Further ones are dropped.
     U32 liveEdges = 4u << 20;
     // Fill and line colours alive in one display list. A shape that needs more is not drawn.
-    U32 liveColors = 1u << 20;
+    U32 liveColors = 1u << 18;
+    // Built gradient ramps alive in one display list. A gradient without one shows what lies below
+    // it.
+    U32 liveRamps = 65536;
+    // Records and styles that shapes may read for one repaint or hit test. A shape that comes later
+    // is not drawn this time.
+    U32 shapeRecords = 8u << 20;
     // Characters of one movie. Further definitions are ignored.
     U32 characters = 65536;
     // Bytes of one script string; a longer one is cut.

@@ -160,12 +160,19 @@ void CRaster::FlushPixels()
     pendingOpaque = true;
 }
 
+// Pixels without alpha are left as they are.
 void CRaster::EmitPixels(S32 x, const RGBI* src, S32 n, bool opaque)
 {
-    if (opaque)
+    if (opaque) {
         ops->writeRow(rowBits, x, src, n);
-    else
-        BlendToOutput(x, src, n);
+        return;
+    }
+    for (S32 i = 0, end; i < n; i = end + 1) {
+        for (end = i; end < n && src[end].alpha; ++end) {
+        }
+        if (end > i)
+            BlendToOutput(x + i, src + i, end - i);
+    }
 }
 
 // Whole pixels x0..x1 of one run.
@@ -202,6 +209,7 @@ void CRaster::PaintMixed(const RRun& run, S32 x, S32 n)
     bool covers = true;
     for (int k = 0; k < run.kinds; ++k)
         covers = covers && stacks[run.stacks[k]].covers;
+    work += U64(n) * stacks[run.stacks[0]].count / 8;
     if (run.kinds == 1) {
         BuildStackRow(run.stacks[0], x, n);
     } else {

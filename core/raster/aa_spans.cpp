@@ -19,7 +19,8 @@ void CRaster::BeginRow()
 
 void CRaster::RecordSpan(S32 xmax)
 {
-    PushSpan(xmax, InternStack(Collect()));
+    if (!rowLost)
+        PushSpan(xmax, InternStack(Collect()));
 }
 
 void CRaster::PushSpan(S32 xmax, U32 stack)
@@ -47,6 +48,8 @@ U32 CRaster::InternStack(int count)
     bool shared = true;
     for (int i = 0; i < count; ++i) {
         RColor* c = collected[count - 1 - i];
+        if (rowLost)
+            return 0;
         shared = shared && i < lastCount && lastColors[i] == c;
         stack = shared ? lastStacks[i] : FindStack(c, stack);
         lastColors[i] = c;
@@ -67,9 +70,12 @@ U32 CRaster::FindStack(RColor* top, U32 below)
         return 0;
     }
     RStackSlot* slot = FindSlot(top, below);
-    if (slot->row != rowSerial)
-        *slot = {rowSerial, NewStack(top, below)};
-    return slot->stack;
+    if (slot->row == rowSerial)
+        return slot->stack;
+    U32 made = NewStack(top, below);
+    if (made)
+        *slot = {rowSerial, made};
+    return made;
 }
 
 // The slot of that stack, or the free one where it belongs.
@@ -90,9 +96,10 @@ RStackSlot* CRaster::FindSlot(const RColor* top, U32 below)
 bool CRaster::GrowIndex()
 {
     size_t size = stackIndex.size() ? stackIndex.size() * 2 : 256;
-    stackIndex.Clear();
-    if (!stackIndex.Resize(size))
+    if (!stackIndex.Reserve(size))
         return false;
+    stackIndex.Clear();
+    stackIndex.Resize(size);
     for (U32 i = 1; i < stacks.size(); ++i)
         *FindSlot(stacks[i].color, stacks[i].below) = {rowSerial, i};
     return true;
@@ -114,7 +121,7 @@ void CRaster::EnterRow(RColor* c)
 
 U32 CRaster::NewStack(RColor* top, U32 below)
 {
-    if (!stacks.Reserve(stacks.size() + 1)) {
+    if (stacks.size() >= kMaxStacks || !stacks.Reserve(stacks.size() + 1)) {
         rowLost = true;
         return 0;
     }

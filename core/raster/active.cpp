@@ -40,14 +40,16 @@ void RActiveEdge::SetUpVertical(S32 atX)
     x = atX;
 }
 
-// How far the stepped curve can stray from the hull of its points: the first difference leaves out
-// half a second difference, and the inverse step count is truncated.
-static S32 StrayBound(const REdge* e)
+// How far the stepped curve can stray from the hull of its points, `width` wide: the first
+// difference leaves out half a second difference, and both differences are made of truncated
+// inverses of the step count, whose error grows with the number of steps.
+static S64 StrayBound(const REdge* e, S64 width)
 {
     if (e->isLine)
         return 1;
-    S32 bend = e->anchor1x - 2 * e->controlx + e->anchor2x;
-    return std::abs(bend) / (e->anchor2y - e->anchor1y) + 16;
+    S64 rise = e->anchor2y - e->anchor1y;
+    S64 n = 2 * rise;
+    return 2 * width / rise + ((2 * width * (n * n + 4 * n)) >> 24) + ((2 * width * n) >> 24) + 16;
 }
 
 void RActiveEdge::SetUp(const REdge* e, S32 y, bool interpolate, S32 xmin, S32 xmax)
@@ -63,7 +65,7 @@ void RActiveEdge::SetUp(const REdge* e, S32 y, bool interpolate, S32 xmin, S32 x
         low = std::min<S32>(low, e->controlx);
         high = std::max<S32>(high, e->controlx);
     }
-    S32 stray = StrayBound(e);
+    S64 stray = StrayBound(e, S64(high) - low);
     if (high + stray < xmin) {
         SetUpVertical(xmin);
     } else if (low - stray >= xmax) {
@@ -108,7 +110,8 @@ bool CRaster::SetUpActive(const REdge* edge)
     if (!a)
         return false;
     a->SetUp(edge, y, !antialias, areaDev.xmin, areaDev.xmax);
-    if (active.Push({a->x, a}))
+    work += 1 + U64(y - std::min<S32>(y, edge->anchor1y)) / 8;
+    if (active.Push({a->x, 0, a}))
         return true;
     activeAlloc.Free(a);
     return false;
@@ -129,15 +132,19 @@ void CRaster::AddActive()
     needsSort = true;
 }
 
+// Stable, with the places as second key, because the library's stable sort would allocate.
 void CRaster::SortAll()
 {
-    std::sort(active.data(), active.data() + active.size(),
-              [](const RActiveRef& a, const RActiveRef& b) { return a.x < b.x; });
+    for (size_t i = 0; i < active.size(); ++i)
+        active[i].place = U32(i);
+    std::sort(active.begin(), active.end(), [](const RActiveRef& a, const RActiveRef& b) {
+        return a.x != b.x ? a.x < b.x : a.place < b.place;
+    });
     work += active.size() * 8;
 }
 
 // The list is nearly in order from scanline to scanline: insertion, unless too much has to move.
-// Edges with equal x may come in any order: what lies between them is empty.
+// Edges with equal x keep their order.
 void CRaster::SortActive()
 {
     needsSort = false;
@@ -150,6 +157,7 @@ void CRaster::SortActive()
         for (; j > 0 && list[j - 1].x > ref.x; --j)
             list[j] = list[j - 1];
         list[j] = ref;
+        work += i - j;
         if (i - j > allowed) {
             SortAll();
             return;

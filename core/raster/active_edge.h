@@ -34,6 +34,7 @@ struct RActiveEdge {
     void Step(S32 y);
 
 private:
+    void StepLine();
     void SetUpLine(const REdge* edge, S32 y);
     void SetUpCurve(const REdge* edge, S32 y);
     void SetUpVertical(S32 atX);
@@ -42,11 +43,16 @@ private:
     S32 RoundedX() const { return S32((xl + 0x8000) >> 16); }
 };
 
+inline void RActiveEdge::StepLine()
+{
+    xl += dx;
+    x = RoundedX();
+}
+
 inline void RActiveEdge::Step(S32 y)
 {
     if (stepKind == kStepLine) {
-        xl += dx;
-        x = RoundedX();
+        StepLine();
     } else if (stepKind == kStepCurve) {
         StepCurve(y);
     } else {

@@ -50,7 +50,7 @@ void CRaster::SwitchOff(RColor* c, S32 x)
     c->visible = 0;
 }
 
-void CRaster::ToggleColor(RColor* c, S32 x)
+void CRaster::DoEdgeEvenOddRule(RColor* c, S32 x)
 {
     if (c->visible)
         SwitchOff(c, x);
@@ -59,7 +59,7 @@ void CRaster::ToggleColor(RColor* c, S32 x)
 }
 
 // The winding count lives in eight bits: 256 turns in one direction are none.
-void CRaster::CountColor(RColor* c, S32 x, S8 dir)
+void CRaster::DoEdgeWindingRule(RColor* c, S32 x, S8 dir)
 {
     if (!c->visible) {
         SwitchOn(c, x, U8(dir));
@@ -72,16 +72,23 @@ void CRaster::CountColor(RColor* c, S32 x, S8 dir)
         SwitchOff(c, x);
 }
 
+// A colour on each side: both switch.
+void CRaster::DoEdgeEdgeRule(const RActiveEdge* e)
+{
+    if (e->color1)
+        DoEdgeEvenOddRule(e->color1, e->x);
+    if (e->color2)
+        DoEdgeEvenOddRule(e->color2, e->x);
+}
+
 void CRaster::CrossEdge(const RActiveEdge* e)
 {
-    if (e->color1) {
-        if (e->fillRule == kRuleWinding)
-            CountColor(e->color1, e->x, e->dir);
-        else
-            ToggleColor(e->color1, e->x);
-    }
-    if (e->color2 && e->fillRule == kRuleEdge)
-        ToggleColor(e->color2, e->x);
+    if (e->fillRule == kRuleEdge)
+        DoEdgeEdgeRule(e);
+    else if (e->color1 && e->fillRule == kRuleWinding)
+        DoEdgeWindingRule(e->color1, e->x, e->dir);
+    else if (e->color1)
+        DoEdgeEvenOddRule(e->color1, e->x);
 }
 
 void CRaster::PaintActive()
@@ -95,16 +102,17 @@ void CRaster::PaintActive()
     for (size_t i = 0; i < n; ++i) {
         RActiveEdge* e = list[i].edge;
         // Once the right border is painted nothing more of this scanline can be seen.
-        if (paintX < areaDev.xmax)
+        if (paintX < areaDev.xmax && work < workLimit)
             CrossEdge(e);
         if (e->ymax <= y + 1) {
             activeAlloc.Free(e);
             continue;
         }
         e->Step(y + 1);
-        list[kept++] = {e->x, e};
+        list[kept++] = {e->x, 0, e};
     }
     active.Truncate(kept);
+    rowLost = rowLost || work >= workLimit;
 }
 
 // The colour's masks are all on, to the outermost.
@@ -124,7 +132,7 @@ int CRaster::Collect()
     int count = 0;
     for (RColor* c = stackTop; c && count < kMaxCollected; c = c->nextActive) {
         ++work;
-        if (c->colorType == kColorClip || (c->clipColor && !ClipIsOn(c)))
+        if (c->skipped || (c->clipColor && !ClipIsOn(c)))
             continue;
         collected[count++] = c;
         if (!c->transparent)

@@ -283,17 +283,19 @@ void BuildRenderTables()
     BuildRingSquares();
 }
 
-void BuildGradientCache(RColor* color)
+bool BuildGradientCache(RColor* color)
 {
     color->ramp.count = std::min<U8>(color->ramp.count, GradColorRamp::kMaxStops);
-    if (color->ramp.count == 0 || color->builtRamp)
-        return;
-    color->builtRamp = color->raster->AllocRamp();
+    if (color->ramp.count == 0)
+        return false;
     if (!color->builtRamp)
-        return;
+        color->builtRamp = color->raster->AllocRamp();
+    if (!color->builtRamp)
+        return false;
     BuildRamp(color->ramp, color->builtRamp);
     color->drawSlabProc = DrawGradientSlab;
     color->buildSlabProc = color->transparent ? CompositeGradientSlab : BuildGradientSlab;
+    return true;
 }
 
 void BuildGradientPixels(const RColor* color, S32 x, S32 n, RGBI* dst)

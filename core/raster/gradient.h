@@ -3,9 +3,9 @@
 
 #include "core/raster/rcolor.h"
 
-// Builds the ramp of a gradient colour and chooses its procedures. Without memory for the ramp, or
-// without stops, the colour draws nothing.
-void BuildGradientCache(RColor* color);
+// Builds the ramp of a gradient colour and chooses its procedures. False, and nothing to draw with,
+// when the colour has no stops or there is no memory for the ramp.
+bool BuildGradientCache(RColor* color);
 
 // n pixels of a gradient colour from x in the raster's current row, each with the value that it has
 // when computed singly.

@@ -5,9 +5,11 @@
 
 #include "core/raster/active_edge.h"
 
+static constexpr int kRampsPerBlock = 16;
+
 CRaster::CRaster()
     : ops(PixelOps(kPixel32)), activeAlloc(sizeof(RActiveEdge), 64, 1, 0x33333333),
-      rampAlloc(kRampEntries * sizeof(U32), 16, 1, 0xEEEEEEEE)
+      rampAlloc(kRampEntries * sizeof(U32), kRampsPerBlock, 1, 0xEEEEEEEE)
 {
     BuildRenderTables();
 }
@@ -22,10 +24,12 @@ void CRaster::Attach(CBitBuffer* to, const SRECT* r, int aa)
     alphaOutput = false;
     area = {};
     if (BitsValid() && !RectIsEmpty(r)) {
-        area.xmin = std::clamp(r->xmin, 0, to->Width());
-        area.xmax = std::clamp(r->xmax, area.xmin, to->Width());
-        area.ymin = std::clamp(r->ymin, 0, to->Height());
-        area.ymax = std::clamp(r->ymax, area.ymin, to->Height());
+        S32 side = aa ? kMaxAntialiasSide : CBitBuffer::kMaxSide;
+        S32 right = std::min(to->Width(), side), bottom = std::min(to->Height(), side);
+        area.xmin = std::clamp(r->xmin, 0, right);
+        area.xmax = std::clamp(r->xmax, area.xmin, right);
+        area.ymin = std::clamp(r->ymin, 0, bottom);
+        area.ymax = std::clamp(r->ymax, area.ymin, bottom);
     }
     S32 scale = aa ? 4 : 1;
     areaDev = {area.xmin * scale, area.xmax * scale, area.ymin * scale, area.ymax * scale};
@@ -53,9 +57,11 @@ void CRaster::BeginPaint()
     needsSort = false;
     layer = 0;
     layersFull = false;
-    work = 0;
     buckets.Clear();
     size_t scanlines = size_t(areaDev.ymax - areaDev.ymin);
+    // Room for crowded pictures of any size, and an end for those that only mean to take time.
+    work = 0;
+    workLimit = (1ull << 25) + (scanlines << 15);
     if (areaDev.xmax <= areaDev.xmin || !buckets.Reserve(scanlines))
         return;
     for (size_t i = 0; i < scanlines; ++i)
@@ -101,10 +107,12 @@ void CRaster::SetYCoord(S32 row)
     rowBits = output->RowAddr(row);
 }
 
-void CRaster::ClearArea()
+void CRaster::FillBackground(SRGB color)
 {
+    RGBI value = {color.blue, color.green, color.red, color.alpha};
+    Premultiply(&value);
     for (S32 row = area.ymin; row < area.ymax; ++row)
-        ops->fillRow(output->RowAddr(row), area.xmin, ops->pack(RGBI()), area.xmax - area.xmin);
+        ops->fillRow(output->RowAddr(row), area.xmin, ops->pack(value), area.xmax - area.xmin);
 }
 
 void CRaster::PaintBits()
@@ -112,8 +120,8 @@ void CRaster::PaintBits()
     if (!BitsValid() || buckets.size() == 0)
         return;
     if (alphaOutput)
-        ClearArea();
-    for (y = areaDev.ymin; y < areaDev.ymax && work < kMaxWork; ++y) {
+        FillBackground(SRGB());
+    for (y = areaDev.ymin; y < areaDev.ymax && work < workLimit; ++y) {
         if (antialias && (y & 3) == 0)
             BeginRow();
         AddActive();
@@ -128,6 +136,7 @@ void CRaster::PaintBits()
     }
     ClearStack();
     FreeActive();
+    buckets.Clear(); // the edges belong to others, who may free them now
 }
 
 // The output is in memory: there is nothing to hand over.
@@ -137,6 +146,15 @@ void CRaster::FreeEmpties()
 {
     activeAlloc.FreeEmpties();
     rampAlloc.FreeEmpties();
+    stacks.Release();
+    stackIndex.Release();
+    for (GrowBuffer<RSpan>& line : sublines)
+        line.Release();
+}
+
+void CRaster::SetRampBudget(U32 ramps)
+{
+    rampAlloc.SetBudget((ramps + kRampsPerBlock - 1) / kRampsPerBlock);
 }
 
 U32* CRaster::AllocRamp()

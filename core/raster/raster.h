@@ -18,6 +18,7 @@ struct RActiveEdge;
 // An entry of the active list: the edge, and its x beside it for sorting.
 struct RActiveRef {
     S32 x;
+    U32 place; // in the list, while it is being sorted as a whole
     RActiveEdge* edge;
 };
 
@@ -71,7 +72,8 @@ public:
     // Binds the output and the pixels to paint: `r` half-open (xmax, ymax exclusive) and clipped to
     // the buffer. `antialias` says in which units the edges come.
     void Attach(CBitBuffer* output, const SRECT* r, int antialias);
-    // Pixels that shine through where nothing opaque is painted; null (the start): white.
+    // Pixels that shine through where nothing opaque is painted; null (the start): white. Not
+    // owned: they must outlive the paints or be taken away.
     void SetBackgroundBits(CBitBuffer* background);
     // The output keeps alpha for this paint: it begins cleared, and what is not covered stays
     // transparent.
@@ -94,12 +96,17 @@ public:
     void PaintBits();
     void Flush();
 
+    // Fills the area with a colour at once, under everything that is painted later.
+    void FillBackground(SRGB color);
+
     // Makes pixel row y the current one.
     void SetYCoord(S32 y);
 
-    // Returns empty blocks of the pools to the system.
+    // Returns empty blocks of the pools, and what a crowded row took, to the system.
     void FreeEmpties();
 
+    // At most about so many ramps from now on.
+    void SetRampBudget(U32 ramps);
     // Memory for one built ramp (kRampEntries words); null when exhausted.
     U32* AllocRamp();
     void FreeRamp(U32* ramp);
@@ -114,10 +121,8 @@ public:
 private:
     static constexpr S32 kPiece = 256;        // pixels that a span buffer holds
     static constexpr int kMaxCollected = 255; // colours that one span can blend
-    static constexpr U64 kMaxWork =
-        1ull << 28; // edge and stack steps of one paint; then rows stay unpainted
-
-    void ClearArea();
+    // Stacks of one pixel row; a row with more stays unpainted.
+    static constexpr size_t kMaxStacks = 1u << 19;
 
     // active.cpp: edges entering, moving and leaving
     void AddActive();
@@ -129,8 +134,9 @@ private:
     // crossing.cpp: the colour stack
     void PaintActive();
     void CrossEdge(const RActiveEdge* edge);
-    void ToggleColor(RColor* c, S32 x);
-    void CountColor(RColor* c, S32 x, S8 dir);
+    void DoEdgeEdgeRule(const RActiveEdge* edge);
+    void DoEdgeEvenOddRule(RColor* c, S32 x);
+    void DoEdgeWindingRule(RColor* c, S32 x, S8 dir);
     void SwitchOn(RColor* c, S32 x, U8 count);
     void SwitchOff(RColor* c, S32 x);
     RColor** FindPlace(RColor* c, S32 x);
@@ -192,9 +198,10 @@ private:
 
     U32 layer = 0;           // of the next object
     bool layersFull = false; // no further object fits above
-    U64 work = 0;
-    S32 y = 0;      // current scanline, device units
-    S32 paintX = 0; // where the next span begins
+    U64 work = 0;            // edge and stack steps of this paint ...
+    U64 workLimit = 0;       // ... and where it ends: further rows stay unpainted
+    S32 y = 0;               // current scanline, device units
+    S32 paintX = 0;          // where the next span begins
     RColor* stackTop = nullptr;
     RColor* collected[kMaxCollected];
 

@@ -73,10 +73,12 @@ void RColor::BuildCache()
 {
     pixValid = 0;
     cached = 1;
+    skipped = colorType == kColorClip;
     if (!raster)
         return;
     if (colorType == kColorGradient) {
-        BuildGradientCache(this);
+        skipped = !BuildGradientCache(this);
+        transparent = transparent || skipped;
     } else if (colorType == kColorSolid) {
         rgbPixel = raster->Ops()->pack(rgb);
         drawSlabProc = DrawSolidSlab;

@@ -39,6 +39,7 @@ struct RColor {
     U8 visible;         // on flag, or the winding count modulo 256; non-zero means on the stack
     U8 colorType;       // RColorType
     U8 cached;          // BuildCache has run
+    U8 skipped;         // nothing to draw: a clip colour, or a cache that could not be built
 
     RDrawSlabProc drawSlabProc;   // writes an opaque span to the output; never null after SetUp
     RBuildSlabProc buildSlabProc; // fills a buffer (opaque), or blends over it (transparent)

@@ -77,6 +77,8 @@ void SCharacterParser::Walk()
 {
     CURVE c;
     for (int flags = GetEdge(&c); flags != kEndOfShape; flags = GetEdge(&c)) {
+        if (!SpendRecord())
+            return;
         if (flags == 0) {
             if (color1)
                 AddCurve(&c);

@@ -43,9 +43,8 @@ void SShapeParser::InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse)
     const MATRIX first = WithoutTranslation(*fillMat);
     MATRIX whole = WithoutTranslation(base);
     MatrixConcat(&first, &whole, &whole);
-    MatrixInvert(&whole, inverse);
     // What has no inverse gives the identity, and that without a translation.
-    if (MatrixIsIdentity(inverse) && !MatrixIsIdentity(&whole))
+    if (!MatrixInvert(&whole, inverse))
         return;
     inverse->tx = S32(-(WideMul(tx, inverse->a) + WideMul(ty, inverse->c)));
     inverse->ty = S32(-(WideMul(ty, inverse->d) + WideMul(tx, inverse->b)));

@@ -79,6 +79,10 @@ public:
     // cache. Without a raster the colour stays as it is and is never drawn.
     void SetupColor(RColor* color);
 
+protected:
+    // Takes one record or style from the display list's budget; false when it is spent.
+    bool SpendRecord();
+
 private:
     static constexpr U32 kInlineStyles = 256;
 

@@ -83,6 +83,14 @@ RColor* SShapeParser::NewColor(U32 number)
     return color;
 }
 
+bool SShapeParser::SpendRecord()
+{
+    if (display->recordsLeft == 0)
+        return false;
+    --display->recordsLeft;
+    return true;
+}
+
 // nFills grows with the table, so that a selector never meets an entry that is not there yet.
 bool SShapeParser::ReadFills()
 {
@@ -90,7 +98,7 @@ bool SShapeParser::ReadFills()
     if (!SizeFills(count))
         return false;
     for (U32 i = 1; i <= count; ++i) {
-        RColor* color = pos < limit ? NewColor(i) : nullptr;
+        RColor* color = pos < limit && SpendRecord() ? NewColor(i) : nullptr;
         if (!color)
             return false;
         fillIndex[i] = color;
@@ -107,7 +115,7 @@ bool SShapeParser::ReadLines()
     if (!SizeLines(count))
         return false;
     for (U32 i = 1; i <= count; ++i) {
-        RColor* color = pos < limit ? NewColor(i + nFills) : nullptr;
+        RColor* color = pos < limit && SpendRecord() ? NewColor(i + nFills) : nullptr;
         if (!color)
             return false;
         lineIndex[i] = {color, MatrixTransformThickness(&mat, ReadWidth())};
