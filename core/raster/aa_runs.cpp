@@ -195,7 +195,8 @@ void CRaster::PaintInterior(const RRun& run, S32 x0, S32 x1)
 
 void CRaster::PaintFlat(Lanes value, S32 x0, S32 x1)
 {
-    if (LaneAlpha(value) == 255) {
+    // A few pixels go along with their neighbours.
+    if (LaneAlpha(value) == 255 && x1 - x0 > 4) {
         ops->fillRow(rowBits, x0, ops->pack(FromLanes(value)), x1 - x0);
         return;
     }

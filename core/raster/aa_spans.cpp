@@ -56,7 +56,6 @@ U32 CRaster::InternStack(int count)
         lastStacks[i] = stack;
     }
     lastCount = count;
-    work += U64(count);
     return stack;
 }
 
@@ -65,6 +64,15 @@ U32 CRaster::FindStack(RColor* top, U32 below)
 {
     if (top->spanRow != rowSerial)
         EnterRow(top);
+    else if (top->lastBelow == below && top->lastStack)
+        return top->lastStack;
+    top->lastBelow = below;
+    top->lastStack = LookUpStack(top, below);
+    return top->lastStack;
+}
+
+U32 CRaster::LookUpStack(RColor* top, U32 below)
+{
     if (stacks.size() * 2 > stackIndex.size() && !GrowIndex()) {
         rowLost = true;
         return 0;
@@ -111,6 +119,7 @@ void CRaster::EnterRow(RColor* c)
 {
     c->spanRow = rowSerial;
     c->rowNumber = rowColors++;
+    c->lastStack = 0;
     c->flatValue = ToLanes(c->rgb);
     c->flatRow = c->colorType == kColorSolid;
     if (c->colorType == kColorGradient) {

@@ -65,10 +65,12 @@ void RActiveEdge::SetUp(const REdge* e, S32 y, bool interpolate, S32 xmin, S32 x
         low = std::min<S32>(low, e->controlx);
         high = std::max<S32>(high, e->controlx);
     }
-    S64 stray = StrayBound(e, S64(high) - low);
-    if (high + stray < xmin) {
+    // Most edges reach into the area; only the others are worth a closer look.
+    bool outside = high < xmin || low >= xmax;
+    S64 stray = outside ? StrayBound(e, S64(high) - low) : 0;
+    if (outside && high + stray < xmin) {
         SetUpVertical(xmin);
-    } else if (low - stray >= xmax) {
+    } else if (outside && low - stray >= xmax) {
         SetUpVertical(xmax);
     } else if (e->isLine) {
         SetUpLine(e, y);

@@ -24,11 +24,13 @@ RColor** CRaster::FindPlace(RColor* c, S32 x)
     RColor** link = &stackTop;
     bool shows = true;
     bool on = c->visible != 0;
+    U64 steps = 1;
     while (*link && (on ? *link != c : (*link)->order >= c->order)) {
         shows = shows && LetsThrough(*link);
         link = &(*link)->nextActive;
-        ++work;
+        ++steps;
     }
+    work += steps;
     if (shows)
         PaintSlab(x);
     return link;
@@ -130,14 +132,16 @@ bool CRaster::ClipIsOn(const RColor* c)
 int CRaster::Collect()
 {
     int count = 0;
+    U64 steps = 1;
     for (RColor* c = stackTop; c && count < kMaxCollected; c = c->nextActive) {
-        ++work;
+        ++steps;
         if (c->skipped || (c->clipColor && !ClipIsOn(c)))
             continue;
         collected[count++] = c;
         if (!c->transparent)
             break;
     }
+    work += steps;
     return count;
 }
 

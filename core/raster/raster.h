@@ -159,6 +159,7 @@ private:
     void EndSubline();
     U32 InternStack(int count);
     U32 FindStack(RColor* top, U32 below);
+    U32 LookUpStack(RColor* top, U32 below);
     RStackSlot* FindSlot(const RColor* top, U32 below);
     bool GrowIndex();
     U32 NewStack(RColor* top, U32 below);

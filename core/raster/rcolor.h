@@ -52,6 +52,8 @@ struct RColor {
     RGBI pixValue;   // that pixel's colour
     U32 spanRow;     // the raster's row serial that the following three belong to
     U32 rowNumber;   // how many colours the raster had met in that row before this one
+    U32 lastBelow;   // the stack that this colour was last seen on, in that row ...
+    U32 lastStack;   // ... and the two together; 0: none yet
     U8 flatRow;      // every pixel of the row's painted part has one colour ...
     Lanes flatValue; // ... this one
 
