@@ -144,6 +144,29 @@ TEST(Gradient, RadialSlabsAndPixelsFollowTheDistance)
                 // Both coordinates are floored to a sixty-fourth of the rim, and the index as well.
                 EXPECT_NEAR(std::min(d, 255.0), s.At(x, y) & 0xFF, 2.6) << x << "," << y;
             }
+        // Under a translucent colour every pixel counts by itself, so columns equal the whole.
+        S32 k = aa ? 4 : 1;
+        RasterScene::Box(s.NewObject(), {0, 100 * k, 0, 100 * k}, s.Solid(0x20FFFFFF));
+        s.Paint();
+        std::vector<U32> whole = s.Pixels();
+        for (S32 x = 0; x < 100 && aa; ++x)
+            s.Paint({x, x + 1, 0, 100});
+        EXPECT_EQ(whole, s.Pixels());
+    }
+}
+
+TEST(Gradient, WithoutStopsWhatLiesBelowShows)
+{
+    for (int aa : {0, 1}) {
+        GradientScene s(8, 1, aa, kFillLinear, {}, {}, {});
+        s.objects.emplace_front();
+        S32 k = aa ? 4 : 1;
+        RasterScene::Box(s.objects.front(), {2 * k, 6 * k, 0, k}, s.Solid(0xFF00FF00));
+        RasterScene::Box(s.NewObject(), {4 * k, 8 * k, 0, k}, s.Solid(0x80FFFFFF));
+        s.Paint(true);
+        const std::vector<U32> want = {0,          0,          0xFF00FF00, 0xFF00FF00,
+                                       0xFF80FF80, 0xFF80FF80, 0x80808080, 0x80808080};
+        EXPECT_EQ(want, s.Pixels());
     }
 }
 
