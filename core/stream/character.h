@@ -61,6 +61,7 @@ struct SSpritePart {
 // the dictionary while something still shows it lives on until the last user lets go.
 struct SCharacter {
     SCharacter* next;     // same chain of the dictionary
+    SCharacter** link;    // what points at this record in its chain
     ScriptPlayer* player; // the movie that owns the entry
     U16 tag;              // the id
     U8 type;              // SCharType

@@ -10,6 +10,24 @@ S32 ChainOf(U16 id)
 {
     return id & (ScriptPlayer::kChains - 1);
 }
+
+void Chain(SCharacter** head, SCharacter* ch)
+{
+    ch->next = *head;
+    ch->link = head;
+    if (ch->next)
+        ch->next->link = &ch->next;
+    *head = ch;
+}
+
+void Unchain(SCharacter* ch)
+{
+    *ch->link = ch->next;
+    if (ch->next)
+        ch->next->link = ch->link;
+    ch->next = nullptr;
+    ch->link = nullptr;
+}
 } // namespace
 
 SCharacter* ScriptPlayer::CreateCharacter(U16 id)
@@ -19,40 +37,56 @@ SCharacter* ScriptPlayer::CreateCharacter(U16 id)
     auto* ch = static_cast<SCharacter*>(charAlloc.Alloc());
     if (!ch)
         return nullptr;
+    if (!IndexCharacter(id, ch)) {
+        charAlloc.Free(ch);
+        return nullptr;
+    }
     characterCount++;
     ch->tag = id;
     ch->player = this;
     ch->type = kCharNone;
     RectSetEmpty(&ch->bounds);
-    ch->next = charIndex[ChainOf(id)];
-    charIndex[ChainOf(id)] = ch;
+    Chain(&charIndex[ChainOf(id)], ch);
     return ch;
+}
+
+// False when there is no memory for the page.
+bool ScriptPlayer::IndexCharacter(U16 id, SCharacter* ch)
+{
+    SCharacter**& page = idPages[id / kIdsPerPage];
+    if (!page)
+        page = static_cast<SCharacter**>(std::calloc(kIdsPerPage, sizeof(SCharacter*)));
+    if (page)
+        page[id % kIdsPerPage] = ch;
+    return page != nullptr;
+}
+
+void ScriptPlayer::FreeIdPages()
+{
+    for (SCharacter**& page : idPages) {
+        std::free(page);
+        page = nullptr;
+    }
 }
 
 SCharacter* ScriptPlayer::FindCharacter(U16 id)
 {
-    SCharacter* ch = charIndex[ChainOf(id)];
-    while (ch && ch->tag != id)
-        ch = ch->next;
-    return ch;
+    SCharacter** page = idPages[id / kIdsPerPage];
+    return page ? page[id % kIdsPerPage] : nullptr;
 }
 
 void ScriptPlayer::FreeCharacter(U16 id)
 {
-    for (SCharacter** link = &charIndex[ChainOf(id)]; *link;) {
-        SCharacter* ch = *link;
-        if (ch->tag != id) {
-            link = &ch->next;
-            continue;
-        }
-        *link = ch->next;
-        FreeCharacter(ch);
-    }
+    SCharacter* ch = FindCharacter(id);
+    if (!ch)
+        return;
+    idPages[id / kIdsPerPage][id % kIdsPerPage] = nullptr;
+    Unchain(ch);
+    FreeCharacter(ch);
 }
 
 void ScriptPlayer::FreeCharacter(SCharacter* ch)
 {
-    ch->next = nullptr;
     if (ch->users == 0) {
         DestroyCharacter(ch);
         return;
@@ -138,10 +172,11 @@ void ScriptPlayer::FreeAll()
     rootObject = nullptr;
     for (SCharacter*& head : charIndex) {
         while (SCharacter* ch = head) {
-            head = ch->next;
+            Unchain(ch);
             FreeCharacter(ch);
         }
     }
+    FreeIdPages();
     RemoveStrays();
     Rewind();
 }

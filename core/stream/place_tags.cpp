@@ -125,6 +125,7 @@ SCharacter* ScriptThread::CopyMovieCharacter(const SCharacter* source)
         return nullptr;
     *copy = *source;
     copy->next = nullptr;
+    copy->link = nullptr;
     copy->users = 0;
     copy->orphan = false;
     copy->privateCopy = true;

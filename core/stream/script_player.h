@@ -23,6 +23,8 @@ public:
     // numFramesComplete of a movie that is all there.
     static constexpr S32 kAllFrames = 16000;
     static constexpr int kChains = 128;
+    static constexpr int kIdsPerPage = 256;
+    static constexpr int kIdPages = 65536 / kIdsPerPage;
 
     ScriptPlayer* nextLayer = nullptr; // link of the player's levels
     char* sourceName = nullptr;        // owned; where the movie came from
@@ -86,7 +88,7 @@ public:
     // Frames whose ShowFrame is there, counted by walking the tags.
     S32 CountFrames() const;
 
-    SCharacter* charIndex[kChains] = {};
+    SCharacter* charIndex[kChains] = {}; // by the low 7 bits of the id: for walks over all
     ChunkAlloc charAlloc;
 
 private:
@@ -98,10 +100,15 @@ private:
     void CountCompleteFrames();
     void ReleaseBuffer();
     void PushVariables(const U8* data, S32 n);
+    bool IndexCharacter(U16 id, SCharacter* ch);
+    void FreeIdPages();
     void DestroyCharacter(SCharacter* ch);
     void ReleaseOrphan(SCharacter* ch);
     void RemoveStrays();
 
+    // By the high byte of the id, then by the low one: a chain may grow to 512 records, too many to
+    // walk for each tag. A page is made with its first character.
+    SCharacter** idPages[kIdPages] = {};
     GrowBuffer<U8> varsData; // bytes of a variables stream
     U32 characterCount = 0;  // records of the pool in use
     U32 orphanCount = 0;     // of these, out of the dictionary
