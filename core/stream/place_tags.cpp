@@ -56,6 +56,9 @@ void ScriptThread::PlaceObject2()
     // own first two bytes. Movies depend on this.
     if (info.flags & PlaceInfo::kName)
         info.name = PeekString();
+    // A new object copies its name, however far the data goes on without a zero byte.
+    if (info.name && !(info.flags & PlaceInfo::kMove))
+        ChargeWork(StrLength(info.name));
     if (info.flags & PlaceInfo::kClipDepth)
         info.clipDepth = GetWord();
     PlaceOrMove(info);

@@ -1,9 +1,18 @@
 #include "core/stream/script_thread.h"
 
+#include <algorithm>
+
 #include "core/display/display_list.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
+
+namespace {
+// Units of work that count as one tag: a byte of a string that is measured or compared is one, a
+// tag that is only passed over is several.
+constexpr U32 kWorkPerTag = 64;
+constexpr int kWorkPerHeader = 4;
+} // namespace
 
 ScriptThread::ScriptThread()
 {
@@ -43,15 +52,27 @@ S32 ScriptThread::DoTag()
 {
     if (atEnd)
         return kAtEnd;
-    if (display && display->tagsLeft == 0)
-        return kNeedsData;
-    if (GetTag(len) < 0)
+    if (!HasBudget() || GetTag(len) < 0)
         return kNeedsData;
     if (display)
         display->tagsLeft--;
     Dispatch();
     pos = tagEnd;
     return scriptErr;
+}
+
+bool ScriptThread::HasBudget() const
+{
+    return !display || display->tagsLeft > 0;
+}
+
+// Takes work off the tick's budget of tags.
+void ScriptThread::ChargeWork(int units)
+{
+    workDone += static_cast<U32>(units);
+    if (display)
+        display->tagsLeft -= std::min(display->tagsLeft, workDone / kWorkPerTag);
+    workDone %= kWorkPerTag;
 }
 
 void ScriptThread::Dispatch()
@@ -218,12 +239,22 @@ S32 ScriptThread::FindLabel(const char* name)
 {
     STagWalker walker(*this, startPos);
     S32 frame = 0;
+    if (!name)
+        return -1;
     // The End tag does not stop the search, only the end of the data does.
-    for (S32 code; (code = walker.GetTag(len)) >= 0; walker.pos = walker.tagEnd) {
+    for (S32 code; HasBudget() && (code = walker.GetTag(len)) >= 0; walker.pos = walker.tagEnd) {
+        ChargeWork(kWorkPerHeader);
         if (code == kTagShowFrame)
             frame++;
-        else if (code == kTagFrameLabel && StrEqual(walker.PeekString(), name))
+        else if (code == kTagFrameLabel && IsLabel(walker.PeekString(), name))
             return frame;
     }
     return -1;
+}
+
+bool ScriptThread::IsLabel(const char* text, const char* name)
+{
+    const int common = StrCommon(text, name);
+    ChargeWork(common);
+    return text[common] == 0 && name[common] == 0;
 }

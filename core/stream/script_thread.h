@@ -75,7 +75,8 @@ public:
     void StopPlay();
     // Plays on; with `rewind` a timeline that stands on its last frame without loop starts anew.
     void Play(bool rewind);
-    // The frame that carries the label, or -1 when it is not there (yet).
+    // The frame that carries the label, or -1 when it is not there (yet). The search takes from the
+    // tick's budget of tags and finds nothing when that is used up.
     S32 FindLabel(const char* name);
 
     // Places a copy of the sprite that `src` drives at `depth` under this timeline's root object.
@@ -101,6 +102,9 @@ protected:
     void Rewind();
 
 private:
+    bool HasBudget() const;
+    void ChargeWork(int units);
+    bool IsLabel(const char* text, const char* name);
     void Dispatch();
     void DispatchDefinition();
     bool MakeRootObject();
@@ -141,6 +145,7 @@ private:
     void AddToBucket(SVariable* var);
     bool GrowIndex();
 
+    U32 workDone = 0;              // units of work not yet charged, less than a tag
     SVariable** buckets = nullptr; // name index, grown with the list; null while the list is short
     U32 bucketCount = 0;
     U32 variableCount = 0;

@@ -37,9 +37,16 @@ char* NewStr(const char* s, size_t n)
 }
 } // namespace
 
+int StrLength(const char* s)
+{
+    const void* end = std::memchr(s, 0, gLimits.stringBytes);
+    return end ? static_cast<int>(static_cast<const char*>(end) - s)
+               : static_cast<int>(gLimits.stringBytes);
+}
+
 char* CreateStr(const char* s)
 {
-    return s ? NewStr(s, std::strlen(s)) : nullptr;
+    return s ? CreateStr(s, StrLength(s)) : nullptr;
 }
 
 char* CreateStr(const char* s, int n)
@@ -62,6 +69,15 @@ bool StrEqual(const char* a, const char* b)
         return false;
     const char* rest = SkipPrefix(a, b);
     return rest && *rest == 0;
+}
+
+int StrCommon(const char* a, const char* b)
+{
+    const int most = static_cast<int>(gLimits.stringBytes);
+    int n = 0;
+    while (n < most && a[n] && Fold(a[n]) == Fold(b[n]))
+        n++;
+    return n;
 }
 
 const char* SkipPrefix(const char* s, const char* prefix)

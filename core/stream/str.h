@@ -4,8 +4,11 @@
 
 #include "core/geom/types.h"
 
-// A copy made on the heap, freed with FreeStr; null for null, and when memory or the limit on the
-// bytes of all strings alive is exhausted.
+// The length of s, or the limit on one string when s is longer: movie data may go on without a zero
+// byte for as long as the movie does. s is not null.
+int StrLength(const char* s);
+// A copy made on the heap, cut at the limit on one string, freed with FreeStr; null for null, and
+// when memory or the limit on the bytes of all strings alive is exhausted.
 char* CreateStr(const char* s);
 // A copy of exactly n bytes with a terminating zero added.
 char* CreateStr(const char* s, int n);
@@ -14,6 +17,9 @@ void FreeStr(char* s);
 
 // Equal under ASCII case folding; false if either is null.
 bool StrEqual(const char* a, const char* b);
+// How many characters a and b have in common at their beginnings under the same folding; counts no
+// further than the limit on one string. Neither is null.
+int StrCommon(const char* a, const char* b);
 // The same for all strings that StrEqual calls equal. s is not null.
 U32 StrHash(const char* s);
 // If s begins with prefix under the same folding, the place in s just after it, else null.

@@ -1,6 +1,5 @@
 // The variables of a timeline: a list in order of creation, with an index once it has grown.
 #include <cstdlib>
-#include <cstring>
 
 #include "core/player/limits.h"
 #include "core/stream/script_thread.h"
@@ -9,19 +8,6 @@
 namespace {
 // A list up to this length is searched from its head; beyond it the index is worth its memory.
 constexpr U32 kPlainList = 16;
-
-// The length of the text, or `most` when it is longer.
-size_t BoundedLength(const char* s, size_t most)
-{
-    const void* end = std::memchr(s, 0, most);
-    return end ? static_cast<size_t>(static_cast<const char*>(end) - s) : most;
-}
-
-char* CopyValue(const char* value)
-{
-    const size_t most = gLimits.stringBytes;
-    return value ? CreateStr(value, static_cast<int>(BoundedLength(value, most))) : nullptr;
-}
 } // namespace
 
 SVariable* ScriptThread::FindVariable(const char* name)
@@ -49,7 +35,7 @@ void ScriptThread::SetVariable(const char* name, const char* value, int)
     if (!var)
         return;
     // The value may be the variable's own string: copied before the old one goes.
-    char* copy = CopyValue(value);
+    char* copy = CreateStr(value);
     FreeStr(var->value);
     var->value = copy;
 }
@@ -59,9 +45,9 @@ SVariable* ScriptThread::NewVariable(const char* name)
 {
     if (!name || variableCount >= gLimits.variables)
         return nullptr;
-    const size_t most = size_t{gLimits.stringBytes} + 1;
-    const size_t nameLen = BoundedLength(name, most);
-    char* copy = nameLen < most ? CreateStr(name, static_cast<int>(nameLen)) : nullptr;
+    const int nameLen = StrLength(name);
+    // Cut, it would be the name of another variable.
+    char* copy = name[nameLen] == 0 ? CreateStr(name, nameLen) : nullptr;
     auto* var = copy ? static_cast<SVariable*>(std::calloc(1, sizeof(SVariable))) : nullptr;
     if (!var) {
         FreeStr(copy);
