@@ -76,11 +76,9 @@ public:
 
     // All bytes are there.
     bool Complete() const { return scriptLen >= 0 && len >= scriptLen; }
-    // Every tag of that frame is there.
-    bool FrameAvailable(S32 n) const
-    {
-        return numFramesComplete == kAllFrames || n <= numFramesComplete;
-    }
+    // Every tag of that frame is there. A movie that is still loading may have counted its way to
+    // the number that stands for all, so that number says nothing here.
+    bool FrameAvailable(S32 n) const { return Complete() || n <= numFramesComplete; }
     // First byte after the movie's readable memory, as an index into `script`.
     S32 DataLimit() const { return scriptLen < 0 ? 0 : scriptLen; }
     // Bytes of `p`, a pointer into the buffer, up to its end; 0 for a foreign pointer.
