@@ -101,6 +101,7 @@ S32 ScriptPlayer::StartMovie()
 
 void ScriptPlayer::ParseHeader()
 {
+    pos = kHeaderBytes; // a rewind while the header was arriving has moved it
     GetRect(&frame);
     const S32 rate = GetWord();
     frameRate = (rate ? rate : 1) * 256; // a rate of 0 counts as the smallest one
