@@ -28,7 +28,8 @@ struct SLimits {
     U32 characters = 65536;
     // Bytes of one script string; a longer one is cut.
     U32 stringBytes = 1u << 20;
-    // Bytes of all names and values alive in the process. Further ones are null: unnamed, unset.
+    // Bytes of all names and values alive in the process, what the heap takes for them and for the
+    // variables' records included. Further ones are null: unnamed, unset.
     U32 allStringBytes = 64u << 20;
     // Variables of one timeline. Further names are dropped.
     U32 variables = 16384;

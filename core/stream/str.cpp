@@ -12,6 +12,9 @@ struct StrHead {
     size_t bytes;
 };
 
+// What the heap takes for a string beside its characters, the head included.
+constexpr size_t kHeapBytes = 32;
+
 size_t liveBytes = 0;
 
 U8 Fold(char c)
@@ -22,14 +25,15 @@ U8 Fold(char c)
 
 char* NewStr(const char* s, size_t n)
 {
-    const size_t bytes = n + 1;
-    if (bytes > gLimits.allStringBytes || liveBytes > gLimits.allStringBytes - bytes)
+    const size_t bytes = n + 1 + kHeapBytes;
+    if (!ReserveStrBytes(bytes))
         return nullptr;
-    auto* head = static_cast<StrHead*>(std::malloc(sizeof(StrHead) + bytes));
-    if (!head)
+    auto* head = static_cast<StrHead*>(std::malloc(sizeof(StrHead) + n + 1));
+    if (!head) {
+        ReturnStrBytes(bytes);
         return nullptr;
+    }
     head->bytes = bytes;
-    liveBytes += bytes;
     char* copy = reinterpret_cast<char*>(head + 1);
     std::memcpy(copy, s, n);
     copy[n] = 0;
@@ -59,8 +63,21 @@ void FreeStr(char* s)
     if (!s)
         return;
     StrHead* head = reinterpret_cast<StrHead*>(s) - 1;
-    liveBytes -= head->bytes;
+    ReturnStrBytes(head->bytes);
     std::free(head);
+}
+
+bool ReserveStrBytes(size_t bytes)
+{
+    if (bytes > gLimits.allStringBytes || liveBytes > gLimits.allStringBytes - bytes)
+        return false;
+    liveBytes += bytes;
+    return true;
+}
+
+void ReturnStrBytes(size_t bytes)
+{
+    liveBytes -= bytes;
 }
 
 bool StrEqual(const char* a, const char* b)

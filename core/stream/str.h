@@ -2,6 +2,8 @@
 // above 0x7F match exactly.
 #pragma once
 
+#include <cstddef>
+
 #include "core/geom/types.h"
 
 // The length of s, or the limit on one string when s is longer: movie data may go on without a zero
@@ -14,6 +16,11 @@ char* CreateStr(const char* s);
 char* CreateStr(const char* s, int n);
 // Only for what CreateStr made; null-safe.
 void FreeStr(char* s);
+
+// Counts bytes of the records that hold strings under the same limit; false, and nothing counted,
+// when it is exhausted.
+bool ReserveStrBytes(size_t bytes);
+void ReturnStrBytes(size_t bytes);
 
 // Equal under ASCII case folding; false if either is null.
 bool StrEqual(const char* a, const char* b);

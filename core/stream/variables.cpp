@@ -8,6 +8,26 @@
 namespace {
 // A list up to this length is searched from its head; beyond it the index is worth its memory.
 constexpr U32 kPlainList = 16;
+// What the heap takes for a variable beside its strings, its share of the index included.
+constexpr size_t kRecordBytes = sizeof(SVariable) + 64;
+
+SVariable* NewRecord()
+{
+    if (!ReserveStrBytes(kRecordBytes))
+        return nullptr;
+    auto* var = static_cast<SVariable*>(std::calloc(1, sizeof(SVariable)));
+    if (!var)
+        ReturnStrBytes(kRecordBytes);
+    return var;
+}
+
+void FreeRecord(SVariable* var)
+{
+    FreeStr(var->name);
+    FreeStr(var->value);
+    std::free(var);
+    ReturnStrBytes(kRecordBytes);
+}
 } // namespace
 
 SVariable* ScriptThread::FindVariable(const char* name)
@@ -46,9 +66,10 @@ SVariable* ScriptThread::NewVariable(const char* name)
     if (!name || variableCount >= gLimits.variables)
         return nullptr;
     const int nameLen = StrLength(name);
-    // Cut, it would be the name of another variable.
-    char* copy = name[nameLen] == 0 ? CreateStr(name, nameLen) : nullptr;
-    auto* var = copy ? static_cast<SVariable*>(std::calloc(1, sizeof(SVariable))) : nullptr;
+    if (name[nameLen] != 0)
+        return nullptr; // cut, it would be the name of another variable
+    char* copy = CreateStr(name, nameLen);
+    SVariable* var = copy ? NewRecord() : nullptr;
     if (!var) {
         FreeStr(copy);
         return nullptr;
@@ -99,9 +120,7 @@ void ScriptThread::ClearVariables()
     while (vars) {
         SVariable* var = vars;
         vars = var->next;
-        FreeStr(var->name);
-        FreeStr(var->value);
-        std::free(var);
+        FreeRecord(var);
     }
     varsTail = nullptr;
     variableCount = 0;
