@@ -69,6 +69,7 @@ public:
     CRaster raster;
     SObject* holdList = nullptr;     // during a hold: the held parent's previous children
     SObject* holdParent = nullptr;   // during a hold: whose children are being rebuilt
+    SObject* objects = nullptr;      // all alive but the root, in the tree or on their way out
     ScriptThread* threads = nullptr; // every live timeline, newest first
     ScriptThread* threadCursor =
         nullptr;               // next thread of the tick's walk; kept valid by RemoveThread
@@ -80,8 +81,9 @@ public:
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes the sounds of buttons
     int editTextFlag = 0;          // some text field draws with a device font
-    U32 recordsLeft = 0; // shape records and styles that this repaint or hit test may read
-    U32 tagsLeft = 0;    // tags that may still run in this tick; see ResetBudget
+    U32 recordsLeft = 0;  // shape records and styles that this repaint or hit test may read
+    U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
+    U32 tagsLeft = 0;     // tags that may still run in this tick; see ResetBudget
 
     ChunkAlloc edgeAlloc;
     ChunkAlloc objectAlloc;
@@ -140,6 +142,10 @@ public:
 
     void AddThread(ScriptThread* thread);
     void RemoveThread(ScriptThread* thread);
+    // For a movie whose dictionary or bytes are about to go: objects that show a character of it
+    // show nothing from now on, and timelines that run its tags stand still. They stay on the list,
+    // so that this is safe in the middle of a placement, a removal or a hold.
+    void ForgetMovie(const ScriptPlayer* movie);
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
@@ -167,6 +173,7 @@ private:
     void AttachTimeline(SObject* obj, ScriptThread* thread);
     ScriptPlayer* CloneMovie(const SCharacter* character);
     void NoteMask(const SObject* mask);
+    void Empty(SObject* obj);
     void Discard(SObject* obj);
     bool KeepsOld(const SObject* old, const SObject* fresh) const;
     void TakeTransform(SObject* old, const SObject* fresh);
@@ -180,6 +187,6 @@ private:
     void FreeEdges(REdge* edges);
 
     U32 nextSerial = 1;
-    S32 openMasks = 0;    // masks whose range is being drawn now
-    U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
+    U32 holdSerial = 0; // objects of this serial and above were placed during the hold
+    S32 openMasks = 0;  // masks whose range is being drawn now
 };

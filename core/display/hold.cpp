@@ -22,6 +22,7 @@ void DisplayList::BeginHold(SObject* parent)
     FinishHold();
     holdParent = parent;
     holdList = parent->bottomChild;
+    holdSerial = nextSerial;
     parent->bottomChild = nullptr;
 }
 
@@ -32,9 +33,12 @@ void DisplayList::FinishHold()
     SObject** link = &holdParent->bottomChild;
     while (holdList)
         link = MergeHeld(link);
-    for (SObject* fresh = *link; fresh; fresh = fresh->above)
-        NoteMask(fresh);
+    SObject* child = holdParent->bottomChild;
     holdParent = nullptr;
+    for (; child; child = child->above) {
+        if (child->serial >= holdSerial)
+            NoteMask(child);
+    }
 }
 
 // Settles the lowest held object against the new object at *link, or moves on to the next new one.
@@ -60,7 +64,6 @@ SObject** DisplayList::MergeHeld(SObject** link)
         }
         DoRemove(&holdList);
     }
-    NoteMask(fresh);
     return &fresh->above;
 }
 
@@ -83,8 +86,8 @@ void DisplayList::TakeTransform(SObject* old, const SObject* fresh)
     old->xform = fresh->xform;
 }
 
-// Puts the lowest held object in the place of the new one. The new one was never painted, so that
-// nothing is to be repainted, not even when it is a mask.
+// Puts the lowest held object in the place of the new one. When several objects share a depth, the
+// new one may be one that was kept before and stands on the screen.
 void DisplayList::KeepOld(SObject** freshLink)
 {
     SObject* old = holdList;
@@ -93,9 +96,9 @@ void DisplayList::KeepOld(SObject** freshLink)
     if (button == fresh)
         button = old;
     holdList = old->above;
-    old->above = fresh->above;
+    old->above = fresh;
     *freshLink = old;
-    Discard(fresh);
+    DoRemove(&old->above);
 }
 
 // Gives the hold up: what it held goes.

@@ -80,8 +80,7 @@ SObject* DisplayList::PlaceObject(SObject* parent, const PlaceInfo* info)
     obj->above = *link;
     *link = obj;
     NameObject(obj, info);
-    if (parent != holdParent) // FinishHold notes those that stay
-        NoteMask(obj);
+    NoteMask(obj);
     obj->Modify();
     StartObject(obj, info);
     return obj;
@@ -102,6 +101,11 @@ void DisplayList::SetPlacement(SObject* obj, SObject* parent, const PlaceInfo* i
     obj->thread = parent->thread;
     obj->serial = nextSerial++;
     obj->nesting = U16(parent->nesting + 1);
+    obj->nextAlive = objects;
+    obj->aliveLink = &objects;
+    if (objects)
+        objects->aliveLink = &obj->nextAlive;
+    objects = obj;
     RectSetEmpty(&obj->devBounds);
     RectSetEmpty(&obj->reservedRect);
 }
@@ -170,12 +174,13 @@ SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
 }
 
 // A mask shows and hides its siblings far outside its own bounds: when it comes or goes, those in
-// its range are to be repainted where they stand.
+// its range are to be repainted where they stand. A mask that an open hold has made has masked
+// nothing yet; FinishHold notes it if it stays.
 void DisplayList::NoteMask(const SObject* mask)
 {
-    if (!mask->IsClip())
-        return;
     SObject* parent = mask->parent;
+    if (!mask->IsClip() || (parent == holdParent && mask->serial >= holdSerial))
+        return;
     if (parent->remaskTo == 0 || mask->depth < parent->remaskFrom)
         parent->remaskFrom = mask->depth;
     parent->remaskTo = std::max(parent->remaskTo, mask->clipDepth);
@@ -222,5 +227,8 @@ void DisplayList::Discard(SObject* obj)
     if (button == obj)
         button = nullptr;
     obj->Free();
+    *obj->aliveLink = obj->nextAlive;
+    if (obj->nextAlive)
+        obj->nextAlive->aliveLink = obj->aliveLink;
     objectAlloc.Free(obj);
 }
