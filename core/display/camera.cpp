@@ -79,6 +79,6 @@ bool DisplayList::SetCamera(const SRECT* frame, const SRECT* client, int aa, S32
 void DisplayList::ModifyCamera()
 {
     UpdateDevViewRect();
-    InvalidateAll();
+    InvalidateRect(&devViewRect);
     root.Modify();
 }

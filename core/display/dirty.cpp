@@ -73,14 +73,6 @@ void DisplayList::InvalidateRect(const SRECT* r)
     MergeDirtyList(nDirty == kMaxDirty);
 }
 
-// Everything; what was pending, perhaps in the coordinates of another camera, is part of that.
-void DisplayList::InvalidateAll()
-{
-    nDirty = 0;
-    RectSetEmpty(&devDirtyRgn);
-    InvalidateRect(&devViewRect);
-}
-
 // Unforced, a pair is merged only when its union is smaller than the two areas together.
 bool DisplayList::MergeDirtyList(bool forced)
 {

@@ -74,7 +74,7 @@ void DisplayList::SetBits(CBitBuffer* buffer)
     bits = buffer;
     root.FreeCacheTree();
     UpdateDevViewRect();
-    InvalidateAll();
+    InvalidateRect(&devViewRect);
 }
 
 void DisplayList::SetBackgroundColor(SRGB color, int priority)
@@ -85,7 +85,7 @@ void DisplayList::SetBackgroundColor(SRGB color, int priority)
     if (color == backgroundColor)
         return;
     backgroundColor = color;
-    InvalidateAll();
+    InvalidateRect(&devViewRect);
 }
 
 void DisplayList::Reset()
@@ -94,7 +94,7 @@ void DisplayList::Reset()
         return;
     backgroundColor = kWhite;
     backgroundPriority = 0;
-    InvalidateAll();
+    InvalidateRect(&devViewRect);
 }
 
 void DisplayList::CalcUpdate()

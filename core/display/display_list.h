@@ -81,6 +81,7 @@ public:
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes the sounds of buttons
     int editTextFlag = 0;          // some text field draws with a device font
+    SCharacter* pending = nullptr; // retained for a placement that waits for a removal
     U32 recordsLeft = 0;  // shape records and styles that this repaint or hit test may read
     U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
     U32 tagsLeft = 0;     // tags that may still run in this tick; see ResetBudget
@@ -143,8 +144,9 @@ public:
     void AddThread(ScriptThread* thread);
     void RemoveThread(ScriptThread* thread);
     // For a movie whose dictionary or bytes are about to go: objects that show a character of it
-    // show nothing from now on, and timelines that run its tags stand still. They stay on the list,
-    // so that this is safe in the middle of a placement, a removal or a hold.
+    // show nothing from now on, timelines that run its tags stand still, and `pending` becomes
+    // GoneCharacter. Nothing leaves the list, so that this is safe in the middle of a placement, a
+    // removal or a hold.
     void ForgetMovie(const ScriptPlayer* movie);
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
@@ -180,7 +182,6 @@ private:
     void KeepOld(SObject** freshLink);
     SObject** MergeHeld(SObject** link);
     void DropHeld();
-    void InvalidateAll();
     void MakeDisjoint();
     void PaintBackground(RColor* color, REdge edges[2]);
     void PaintFocus(RColor* color, REdge** edges);
