@@ -115,6 +115,7 @@ void SObject::FreeChildren()
     while (bottomChild) {
         SObject* child = bottomChild;
         bottomChild = child->above;
+        child->FreeChildren();
         if (child->drawn)
             display->InvalidateRect(&child->devBounds);
         display->Discard(child);
