@@ -2,7 +2,7 @@
 
 #include <charconv>
 
-bool Arguments::Parse(std::span<char* const> words, std::span<const OptionSpec> known)
+bool Arguments::Parse(std::span<char* const> words, std::span<const OptionForm> known)
 {
     bool optionsOver = false;
     for (size_t i = 0; i < words.size(); i++) {
@@ -17,25 +17,25 @@ bool Arguments::Parse(std::span<char* const> words, std::span<const OptionSpec> 
     return true;
 }
 
-bool Arguments::Take(std::span<char* const> words, size_t& i, std::span<const OptionSpec> known)
+bool Arguments::Take(std::span<char* const> words, size_t& i, std::span<const OptionForm> known)
 {
     const std::string word = words[i];
     const size_t equals = word.compare(0, 2, "--") == 0 ? word.find('=') : std::string::npos;
     Given given = {word.substr(0, equals), ""};
-    const OptionSpec* spec = nullptr;
-    for (const OptionSpec& candidate : known) {
+    const OptionForm* option = nullptr;
+    for (const OptionForm& candidate : known) {
         if (given.name == candidate.name)
-            spec = &candidate;
+            option = &candidate;
     }
-    if (spec == nullptr) {
+    if (option == nullptr) {
         error = "unknown option " + given.name;
-    } else if (!spec->takesValue && equals != std::string::npos) {
+    } else if (!option->takesValue && equals != std::string::npos) {
         error = given.name + " takes no value";
-    } else if (spec->takesValue && equals != std::string::npos) {
+    } else if (option->takesValue && equals != std::string::npos) {
         given.value = word.substr(equals + 1);
-    } else if (spec->takesValue && i + 1 == words.size()) {
+    } else if (option->takesValue && i + 1 == words.size()) {
         error = given.name + " needs a value";
-    } else if (spec->takesValue) {
+    } else if (option->takesValue) {
         given.value = words[++i];
     }
     options.push_back(given);

@@ -6,7 +6,7 @@
 #include <vector>
 
 // An option that a command knows, with its dashes.
-struct OptionSpec {
+struct OptionForm {
     const char* name;
     bool takesValue;
 };
@@ -16,7 +16,7 @@ struct OptionSpec {
 class Arguments {
 public:
     // False, with `error` set, when an option is unknown, lacks its value or has one too many.
-    bool Parse(std::span<char* const> words, std::span<const OptionSpec> known);
+    bool Parse(std::span<char* const> words, std::span<const OptionForm> known);
 
     bool Has(const char* option) const { return Find(option) != nullptr; }
     // The option's value, or null when it was not given.
@@ -30,7 +30,7 @@ private:
         std::string name;
         std::string value;
     };
-    bool Take(std::span<char* const> words, size_t& i, std::span<const OptionSpec> known);
+    bool Take(std::span<char* const> words, size_t& i, std::span<const OptionForm> known);
 
     std::vector<Given> options;
     std::vector<std::string> rest;

@@ -109,7 +109,7 @@ void PrintJson(const MovieFile& file, const MovieInfo& info)
 
 int InfoCommand(std::span<char* const> words)
 {
-    constexpr OptionSpec kOptions[] = {{"--json", false}};
+    constexpr OptionForm kOptions[] = {{"--json", false}};
     Arguments args;
     if (!args.Parse(words, kOptions))
         return ComplainUsage(args.error);

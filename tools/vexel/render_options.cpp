@@ -6,7 +6,7 @@
 
 namespace {
 
-constexpr OptionSpec kOptions[] = {
+constexpr OptionForm kOptions[] = {
     {"-o", true},        {"--frame", true},      {"--frames", true},    {"--size", true},
     {"--quality", true}, {"--background", true}, {"--progress", false},
 };
