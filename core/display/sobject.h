@@ -50,6 +50,8 @@ struct SObject {
     EditText* editText;    // of a text field, owned
     U8 built;              // edges and colours are those of the shape, even when there are none
     U32 serial;            // never the same for two objects of one list: tells a recycled record
+    SObject* nextAlive;    // links of the display list's objects
+    SObject** aliveLink;
     U16 nesting;           // number of parents
     U16 remaskFrom; // children of these depths were masked anew since the last recalculation: they
     U16 remaskTo;   // are to be repainted where they stand; none when remaskTo is 0

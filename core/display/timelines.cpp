@@ -137,7 +137,37 @@ void SObject::LeaveTimeline()
     own->rootObject = nullptr;
     if (character->type == kCharMovieRoot)
         return;
-    if (own->IsRoot() && static_cast<ScriptPlayer*>(own)->sharedCopy)
-        display->clonedMovies--;
     delete own;
+}
+
+static SCharacter* ExchangeForGone(SCharacter* ch)
+{
+    ReleaseCharacter(ch);
+    RetainCharacter(GoneCharacter());
+    return GoneCharacter();
+}
+
+void DisplayList::ForgetMovie(const ScriptPlayer* movie)
+{
+    for (SObject* obj = objects; obj; obj = obj->nextAlive) {
+        if (obj->character && obj->character->player == movie)
+            Empty(obj);
+    }
+    if (pending && pending->player == movie)
+        pending = ExchangeForGone(pending);
+    for (ScriptThread* thread = threads; thread; thread = thread->nextThread) {
+        if (thread->player == movie && thread != movie)
+            thread->LoseMovie();
+    }
+}
+
+void DisplayList::Empty(SObject* obj)
+{
+    NoteMask(obj);
+    obj->clipDepth = 0;
+    obj->Modify();
+    obj->FreeCache();
+    if (button == obj)
+        button = nullptr;
+    obj->character = ExchangeForGone(obj->character);
 }

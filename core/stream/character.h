@@ -84,3 +84,7 @@ struct SCharacter {
     // End of the readable bytes for a parser over `data`.
     S32 DataLen() const { return data ? dataLen : 0; }
 };
+
+// What an object shows once the movie of its character is gone: nothing. Of type kCharNone and of
+// no movie; there is one for all, and it is never freed.
+SCharacter* GoneCharacter();

@@ -92,7 +92,6 @@ void ScriptPlayer::FreeCharacter(SCharacter* ch)
         return;
     }
     ch->orphan = true;
-    orphanCount++;
 }
 
 void ScriptPlayer::DestroyCharacter(SCharacter* ch)
@@ -101,12 +100,6 @@ void ScriptPlayer::DestroyCharacter(SCharacter* ch)
         ch->bitmap.PIFree();
     characterCount--;
     charAlloc.Free(ch);
-}
-
-void ScriptPlayer::ReleaseOrphan(SCharacter* ch)
-{
-    orphanCount--;
-    DestroyCharacter(ch);
 }
 
 // From the heap and not from the pool: the object that owns it may outlive the movie by a moment,
@@ -136,40 +129,35 @@ void ReleaseCharacter(SCharacter* ch)
     if (ch->privateCopy)
         std::free(ch);
     else if (ch->orphan)
-        ch->player->ReleaseOrphan(ch);
+        ch->player->DestroyCharacter(ch);
 }
 
-namespace {
-// The first object of the subtree that shows an orphan of the movie, or null.
-SObject* FindStray(SObject* obj, const ScriptPlayer* movie)
+SCharacter* GoneCharacter()
 {
-    const SCharacter* ch = obj->character;
-    if (ch && ch->orphan && ch->player == movie)
-        return obj;
-    for (SObject* child = obj->bottomChild; child; child = child->above) {
-        if (SObject* stray = FindStray(child, movie))
-            return stray;
-    }
-    return nullptr;
+    static SCharacter gone = {};
+    gone.type = kCharNone;
+    RectSetEmpty(&gone.bounds);
+    return &gone;
 }
-} // namespace
 
-// Records and bytes go away with the movie, so no object may go on showing them, wherever it hangs.
-void ScriptPlayer::RemoveStrays()
+// The object of a movie that is shown in a sprite's place would take this movie along: it is cut
+// loose first.
+void ScriptPlayer::RemoveRootObject()
 {
-    while (orphanCount > 0 && display) {
-        SObject* stray = FindStray(&display->root, this);
-        if (!stray)
-            return;
-        display->RemoveThisObject(stray);
-    }
+    SObject* obj = rootObject;
+    rootObject = nullptr;
+    if (!obj || !display)
+        return;
+    if (obj->thread == this)
+        obj->thread = nullptr;
+    display->RemoveThisObject(obj);
 }
 
 void ScriptPlayer::FreeAll()
 {
-    if (rootObject && display)
-        display->RemoveThisObject(rootObject);
-    rootObject = nullptr;
+    RemoveRootObject();
+    if (display)
+        display->ForgetMovie(this);
     for (SCharacter*& head : charIndex) {
         while (SCharacter* ch = head) {
             Unchain(ch);
@@ -177,7 +165,6 @@ void ScriptPlayer::FreeAll()
         }
     }
     FreeIdPages();
-    RemoveStrays();
     Rewind();
 }
 

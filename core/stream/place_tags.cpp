@@ -107,6 +107,13 @@ void SetName(PlaceInfo* info, const char* name)
         info->flags |= PlaceInfo::kName;
 }
 
+SCharacter* TakePending(DisplayList* list)
+{
+    SCharacter* ch = list->pending;
+    list->pending = nullptr;
+    return ch;
+}
+
 // A sprite without frames in the place of `old`, for one object; null when memory is exhausted.
 SCharacter* NewEmptySprite(ScriptPlayer* movie, const SCharacter* old)
 {
@@ -158,7 +165,9 @@ void ScriptThread::CloneSprite(ScriptThread* src, const char* name, S32 depth)
     char* nameCopy = CreateStr(name);
     SetName(&info, nameCopy);
     RetainCharacter(info.character);
+    display->pending = info.character;
     display->RemoveObject(rootObject, info.depth);
+    info.character = TakePending(display); // its movie may have gone with what stood there
     display->PlaceObject(rootObject, &info);
     ReleaseCharacter(info.character);
     FreeStr(nameCopy);
@@ -183,7 +192,9 @@ void ScriptThread::RemoveSprite(ScriptThread* sprite, bool keep)
     char* nameCopy = CreateStr(old->name);
     SetName(&info, nameCopy);
     RetainCharacter(info.character);
+    list->pending = info.character;
     list->RemoveThisObject(old);
+    info.character = TakePending(list);
     if (info.character)
         list->PlaceObject(parent, &info);
     ReleaseCharacter(info.character);

@@ -6,6 +6,7 @@
 #include <cstring>
 #include <new>
 
+#include "core/display/display_list.h"
 #include "core/player/limits.h"
 #include "core/player/player.h"
 #include "core/stream/str.h"
@@ -193,6 +194,8 @@ void ScriptPlayer::ReleaseBuffer()
         std::free(Writable(script));
     }
     sharedScript = nullptr;
+    if (sharedCopy && display)
+        display->clonedMovies--;
     sharedCopy = false;
     script = nullptr;
     varsData.Clear();

@@ -56,9 +56,12 @@ public:
     // The stream has ended.
     void SetDataComplete();
 
-    // Drops the movie and all that came of it; ready for another.
+    // Drops the movie and all that came of it; ready for another. A movie shown in a sprite's place
+    // belongs to its object, which goes: the caller has the movie from then on.
     void ClearScript();
-    // Drops the dictionary and rewinds; the bytes stay, so that the movie can run again.
+    // Drops the root object and the dictionary, and rewinds; the bytes stay, so that the movie can
+    // run again. Objects elsewhere that show characters of this movie (clones of its sprites, for
+    // example) stay where they are, but empty; see DisplayList::ForgetMovie.
     void FreeAll();
     // Drops decoded pixels that nobody uses, and empty pool blocks.
     void FreeCache();
@@ -101,15 +104,13 @@ private:
     bool IndexCharacter(U16 id, SCharacter* ch);
     void FreeIdPages();
     void DestroyCharacter(SCharacter* ch);
-    void ReleaseOrphan(SCharacter* ch);
-    void RemoveStrays();
+    void RemoveRootObject();
 
     // By the high byte of the id, then by the low one: a chain may grow to 512 records, too many to
     // walk for each tag. A page is made with its first character.
     SCharacter** idPages[kIdPages] = {};
     GrowBuffer<U8> varsData; // bytes of a variables stream
     U32 characterCount = 0;  // records of the pool in use
-    U32 orphanCount = 0;     // of these, out of the dictionary
 };
 
 // A user of a character's record: a pointer that must stay valid.

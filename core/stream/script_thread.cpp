@@ -43,6 +43,14 @@ void ScriptThread::ClearState()
     loop = true;
 }
 
+// Safe while a tag of this very timeline is being executed: what it reads from here on is zeros.
+void ScriptThread::LoseMovie()
+{
+    ClearState();
+    player = nullptr;
+    playing = false;
+}
+
 bool ScriptThread::IsRoot() const
 {
     return player == this;

@@ -86,6 +86,8 @@ public:
 
     // Back to a timeline without data that has not started.
     void ClearState();
+    // The movie is going, but not this timeline of it: it stands still for good, without data.
+    void LoseMovie();
 
     // Sets or appends; the name and the value are copied, a null value is stored as null. `flag` is
     // passed on to the text fields that show the variable.

@@ -145,7 +145,7 @@ TEST(Clone, RemovedSpritesCanLeaveAnEmptyOne)
     scene.movie.RemoveSprite(nullptr, true);
 }
 
-// A movie that goes takes along what others show of its characters.
+// What others show of a movie's characters is empty once the movie is gone.
 TEST(Clone, NothingShowsTheCharactersOfAMovieThatIsGone)
 {
     StreamScene scene(NamedSprite());
@@ -160,7 +160,7 @@ TEST(Clone, NothingShowsTheCharactersOfAMovieThatIsGone)
         scene.movie.CloneSprite(scene.list.FindChild(other.rootObject, 3)->thread, "x", 20000);
         EXPECT_EQ(scene.Tree(), "3:2@50(1:1) 20000:2@50(1:1)");
     }
-    EXPECT_EQ(scene.Tree(), "3:2@50(1:1)");
+    EXPECT_EQ(scene.Tree(), "3:2@50(1:1) 20000:0@50(1:0)") << "empty";
     scene.Tick();
     EXPECT_EQ(scene.movie.curFrame, 1);
 }
