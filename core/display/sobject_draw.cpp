@@ -2,25 +2,12 @@
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
 
-namespace {
-// Bounds and area meet, the bounds taken as wide as InvalidateRect takes them: what thin strokes
-// and rounding put just outside them belongs to a partial repaint as well as to a full one.
-bool MeetsArea(const SObject* obj, const SRECT* area, S32 margin)
-{
-    if (RectIsEmpty(&obj->devBounds))
-        return false;
-    const SRECT wide = {area->xmin - margin, area->xmax + margin, area->ymin - margin,
-                        area->ymax + margin};
-    return RectTestIntersect(&obj->devBounds, &wide);
-}
-} // namespace
-
 void SObject::Draw(CRaster* raster, STransform placed, RColor* clip)
 {
     if (!visible)
         return;
     placed.Concat(&xform);
-    if (MeetsArea(this, raster->AreaDev(), display->antialias ? 8 : 2)) {
+    if (RectTestIntersect(&devBounds, raster->AreaDev())) {
         BuildEdges(&placed);
         raster->AddEdges(edges, colors, clip);
         drawn = 1;
