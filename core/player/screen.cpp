@@ -80,19 +80,13 @@ void SPlayer::CheckUpdate()
 
 void SPlayer::Repaint(const SRECT* r)
 {
-    UpdateBuffer(0);
-    if (bits.HasBits()) {
-        const SRECT whole = {0, bits.Width(), 0, bits.Height()};
-        SRECT area;
-        RectIntersect(r, &whole, &area);
-        if (RectIsEmpty(&area))
-            return;
-        RectUnion(&screenDirty, &area, &screenDirty);
-        if (scene.antialias)
-            RectShift(&area, 2, &area);
-        scene.InvalidateRect(&area);
-        UpdateBuffer(1);
-    }
+    constexpr SRECT kAnyBits = {0, CBitBuffer::kMaxSide, 0, CBitBuffer::kMaxSide};
+    SRECT area;
+    RectIntersect(r, &kAnyBits, &area);
+    if (scene.antialias)
+        RectShift(&area, 2, &area);
+    scene.InvalidateRect(&area);
+    UpdateBuffer(1);
     BlitPending();
 }
 
@@ -105,8 +99,5 @@ void SPlayer::OnDraw()
 void SPlayer::FreeBuffer()
 {
     bits.FreeBits();
-    scene.ModifyCamera();
-    SRECT client;
-    ClientRect(&client);
-    InvalidateScreenArea(&client);
+    scene.InvalidateRect(&scene.devViewRect);
 }
