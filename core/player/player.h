@@ -73,10 +73,6 @@ public:
     virtual void ClientRect(SRECT* r) = 0;
     // Offers a window size in pixels for a movie that has just been opened.
     virtual void AdjustWindow(S32 width, S32 height) = 0;
-    // Copies pixel rectangle `r` of the player's bits to the screen.
-    virtual void BltToScreen(const SRECT* r) = 0;
-    // Clears the screen: there are no bits to show.
-    virtual void ClearScreen() = 0;
     // Starts a POST or a GET request; its data arrives later, never inside the call.
     virtual void StreamPostURLNotify(const char* url, const char* target, U32 length,
                                      const char* data, void* notifyData) = 0;
@@ -87,6 +83,10 @@ public:
     virtual void ProcessFSCommand(const char* command, const char* args) = 0;
     virtual void EnableMenus(const MenuStatus& status) = 0;
     virtual void UpdateCursor() = 0;
+    // Copies pixel rectangle `r` of the player's bits to the screen.
+    virtual void BltToScreen(const SRECT* r) = 0;
+    // Clears the screen: there are no bits to show.
+    virtual void ClearScreen() = 0;
 
     // --- the tick ---
     // Advances every timeline by one frame if one is due (always, when `checkTime` is off) and
@@ -115,10 +115,11 @@ public:
     void UpdateScreen();
     // Asks the shell to redraw what changed, instead of painting at once.
     void CheckUpdate();
-    // Repaints pixel rectangle `r`.
+    // Repaints pixel rectangle `r`, with all else that changed.
     void Repaint(const SRECT* r);
     // The shell's redraw.
     void OnDraw();
+    // Frees the screen bitmap, which the next paint makes anew.
     void FreeBuffer();
 
     // --- view ---
