@@ -24,8 +24,6 @@ void SPlayer::SetCamera(int update)
 
 void SPlayer::Home()
 {
-    if (scaleMode == kScaleFixed)
-        scaleMode = kScaleShowAll;
     RectSetEmpty(&zoomRect);
     SetCamera(2);
 }
@@ -33,6 +31,8 @@ void SPlayer::Home()
 void SPlayer::SetZoomRect(S32 xmin, S32 ymin, S32 xmax, S32 ymax)
 {
     if (xmin >= xmax || ymin >= ymax) {
+        if (scaleMode == kScaleFixed)
+            scaleMode = kScaleShowAll;
         Home();
         return;
     }

@@ -1,4 +1,5 @@
 #include "core/player/player.h"
+#include "core/stream/tags.h"
 
 #include <cstdio>
 
@@ -6,6 +7,13 @@ namespace {
 
 constexpr S32 kCursorInterval = 400; // milliseconds between two looks at the cursor
 constexpr S32 kTimerShare = 10;      // timer periods in a frame
+
+// Whether a tag other than the end's is there to be run next.
+bool CanAdvance(const ScriptThread& timeline)
+{
+    STagWalker next(timeline, timeline.pos);
+    return !timeline.atEnd && next.GetTag(timeline.len) > kTagEnd;
+}
 
 } // namespace
 
@@ -92,7 +100,7 @@ void SPlayer::GetMenuState(MenuStatus* status)
 {
     const S32 movieLoaded = gotHeader && scriptErr == 0;
     const S32 several = numFrames > 1;
-    const S32 beyondFirst = curFrame > 0;
+    const S32 beyondFirst = curFrame != 0;
     const S32 zoomed = !RectIsEmpty(&zoomRect);
     const S32 fixedScale = scaleMode == kScaleFixed;
     *status = {};
@@ -100,7 +108,7 @@ void SPlayer::GetMenuState(MenuStatus* status)
     status->zoomed = zoomed;
     status->canPlay = status->canLoop = several;
     status->canRewind = status->canBack = beyondFirst;
-    status->canForward = curFrame < numFrames - 1;
+    status->canForward = CanAdvance(*this);
     status->view100 = fixedScale;
     status->viewAll = !zoomed && !fixedScale;
     status->highQuality = highQuality;
