@@ -103,8 +103,9 @@ void SCharacterParser::ChangeFills()
     fillRule = color2 ? kRuleEdge : useWinding ? kRuleWinding : kRuleEvenOdd;
 }
 
-// A mask of several style blocks keeps its one colour through all of them. A shape without fills
-// gets none, and so is no mask: what it would have hidden is drawn.
+// A mask of several style blocks keeps its one colour through all of them. A shape without any
+// styles has no colours and so is no mask: what it would have hidden is drawn. One with lines but
+// no fills keeps their colours, which no edge carries, and hides its whole range.
 void SCharacterParser::MakeClipper()
 {
     if (!clipColor && nFills > 0)
