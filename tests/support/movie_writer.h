@@ -1,5 +1,6 @@
 #pragma once
 
+#include "core/stream/tags.h"
 #include "tests/support/shape_writer.h"
 
 #include <optional>
@@ -22,33 +23,48 @@ struct PlaceOptions {
 class TagWriter {
 public:
     TagWriter& Raw(int code, const std::vector<U8>& body, bool forceLong = false);
+    TagWriter& Raw(int code, const ByteWriter& body) { return Raw(code, body.Bytes()); }
 
     // Codes 2 and 22 have no alpha in their colours, 32 has.
     TagWriter& DefineShape(U16 id, int code, const Box& bounds, const ShapeBuilder& shape);
-    TagWriter& DefineShape(U16 id, const ShapeBuilder& shape, int code = 32);
-    TagWriter& DefineSprite(U16 id, U16 frameCount, const TagWriter& tags);
-    TagWriter& DefineSprite(U16 id, const TagWriter& tags); // counts the frames itself
-    TagWriter& FreeCharacter(U16 id);
+    TagWriter& DefineShape(U16 id, const ShapeBuilder& shape, int code = kTagDefineShape3)
+    {
+        return DefineShape(id, code, shape.Bounds(), shape);
+    }
+    TagWriter& DefineSprite(U16 id, U16 frameCount, const TagWriter& nested);
+    TagWriter& DefineSprite(U16 id, const TagWriter& nested) // counts the frames itself
+    {
+        return DefineSprite(id, U16(nested.Frames()), nested);
+    }
+    TagWriter& FreeCharacter(U16 id) { return Raw(kTagFreeCharacter, Numbers(id)); }
 
-    TagWriter& Place(U16 id, U16 depth, const Mat& mat = {}); // code 4
-    TagWriter& Place(U16 id, U16 depth, const Mat& mat, const Cx& cx);
+    // Code 4.
+    TagWriter& Place(U16 id, U16 depth, const Mat& mat = {}, const std::optional<Cx>& cx = {});
     TagWriter& Place2(U16 depth, const PlaceOptions& options); // code 26
     // The commonest Place2: a new place for what stands at the depth.
-    TagWriter& Move(U16 depth, const Mat& mat);
-    TagWriter& Move(U16 depth, const Mat& mat, const Cx& cx);
-    TagWriter& Remove(U16 id, U16 depth); // code 5
-    TagWriter& RemoveDepth(U16 depth);    // code 28
+    TagWriter& Move(U16 depth, const Mat& mat, const std::optional<Cx>& cx = {})
+    {
+        return Place2(depth, {.move = true, .matrix = mat, .cx = cx});
+    }
+    TagWriter& Remove(U16 id, U16 depth) { return Raw(kTagRemoveObject, Numbers(id, depth)); }
+    TagWriter& RemoveDepth(U16 depth) { return Raw(kTagRemoveObject2, Numbers(depth)); }
 
-    TagWriter& Background(Rgba color);
-    TagWriter& Label(const std::string& name);
-    TagWriter& DoAction(const std::vector<U8>& actions);
+    TagWriter& Background(Rgba color)
+    {
+        return Raw(kTagSetBackgroundColor, ByteWriter().PutColor(color, false));
+    }
+    TagWriter& Label(std::string_view s) { return Raw(kTagFrameLabel, ByteWriter().PutString(s)); }
+    TagWriter& DoAction(const std::vector<U8>& actions) { return Raw(kTagDoAction, actions); }
     TagWriter& Show(int times = 1);
-    TagWriter& End();
+    TagWriter& End() { return Raw(kTagEnd, ByteWriter()); }
 
     int Frames() const { return frames; } // ShowFrame tags so far
     const std::vector<U8>& Tags() const { return tags.Bytes(); }
 
 private:
+    static ByteWriter Numbers(U16 first) { return ByteWriter().PutU16(first); }
+    static ByteWriter Numbers(U16 first, U16 next) { return Numbers(first).PutU16(next); }
+
     ByteWriter tags;
     int frames = 0;
 };
@@ -64,8 +80,14 @@ inline U16 Fps(double framesPerSecond)
 class MovieWriter : public TagWriter {
 public:
     explicit MovieWriter(S32 width = 640 * 20, S32 height = 480 * 20, U16 rate = 12 << 8,
-                         std::optional<U16> frameCount = {});
-    MovieWriter(const Box& frame, U16 rate, std::optional<U16> frameCount = {});
+                         std::optional<U16> frameCount = {})
+        : MovieWriter(Box{0, width, 0, height}, rate, frameCount)
+    {
+    }
+    MovieWriter(const Box& frame, U16 rate, std::optional<U16> frameCount = {})
+        : frameBox(frame), frameRate(rate), count(frameCount)
+    {
+    }
 
     // The header, with the file's true length, and the tags so far.
     std::vector<U8> Bytes() const;

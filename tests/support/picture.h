@@ -1,7 +1,8 @@
 #pragma once
 
-#include "core/geom/types.h"
+#include "core/raster/bit_buffer.h"
 
+#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -19,26 +20,28 @@ struct Picture {
     U32& At(int x, int y) { return pixels[size_t(y) * size_t(width) + size_t(x)]; }
 };
 
+// The pixels as a player holds them.
+inline Picture PictureOf(const CBitBuffer& bits)
+{
+    Picture p(bits.Width(), bits.Height());
+    for (int y = 0; y < p.height; y++)
+        std::copy_n(bits.Row32(y), p.width, &p.At(0, y));
+    return p;
+}
+
 // What Compare found. Pictures of unlike sizes differ in every pixel, by 255.
 struct PictureDiff {
-    int count = 0;                // pixels with a channel further apart than the tolerance
-    int largest = 0;              // greatest distance in any channel of any pixel
-    int firstX = -1, firstY = -1; // the first of the counted pixels in row order
+    int count = 0;         // pixels that differ
+    int largest = 0;       // greatest distance in any channel of any pixel
+    int x = 0, y = 0;      // the first of those pixels in row order,
+    U32 got = 0, want = 0; // and what stands there
 };
 
 // Reads a PNG file; false leaves the picture empty.
 bool LoadPng(const std::string& path, Picture* picture);
-// Writes a PNG file; false when it cannot be written.
-bool SavePng(const std::string& path, const Picture& picture);
+PictureDiff Compare(const Picture& got, const Picture& want);
 
-PictureDiff Compare(const Picture& got, const Picture& want, int tolerance = 0);
-
-// For EXPECT_EQ("", ExpectSame(...)): empty when at most `allowed` pixels differ by more than the
-// tolerance. Otherwise a sentence about the difference, after writing NAME-got.png, NAME-want.png
-// and NAME-diff.png (differing pixels in red on a dimmed grey) into the folder that the environment
+// For EXPECT_EQ("", ExpectSame(...)): empty when the pictures are equal. Otherwise a sentence about
+// the difference, after writing NAME-got.png and NAME-want.png into the folder that the environment
 // variable VEXEL_TEST_OUT names, or test-out below the current one.
-std::string ExpectSame(const Picture& got, const Picture& want, const std::string& name,
-                       int tolerance = 0, int allowed = 0);
-// The same against a picture file; a file that cannot be read is a difference.
-std::string ExpectSamePng(const Picture& got, const std::string& wantPath, const std::string& name,
-                          int tolerance = 0, int allowed = 0);
+std::string ExpectSame(const Picture& got, const Picture& want, const std::string& name);

@@ -2,8 +2,6 @@
 
 #include "tests/support/byte_writer.h"
 
-#include <vector>
-
 // One stop of a gradient: its place on the ramp, 0..255, and its colour there.
 struct Stop {
     U8 ratio = 0;
@@ -18,10 +16,11 @@ struct Fill {
     Mat mat;        // gradient square or bitmap pixels to shape twips
     std::vector<Stop> stops;
 
-    static Fill Solid(Rgba color);
-    static Fill Linear(const Mat& mat, std::vector<Stop> stops);
-    static Fill Radial(const Mat& mat, std::vector<Stop> stops);
-    static Fill Bitmap(U8 type, U16 id, const Mat& mat);
+    using Stops = std::vector<Stop>;
+    static Fill Solid(Rgba color) { return {0x00, color, 0, {}, {}}; }
+    static Fill Linear(const Mat& mat, const Stops& stops) { return {0x10, {}, 0, mat, stops}; }
+    static Fill Radial(const Mat& mat, const Stops& stops) { return {0x12, {}, 0, mat, stops}; }
+    static Fill Bitmap(U8 type, U16 id, const Mat& mat) { return {type, {}, id, mat, {}}; }
 };
 
 // A stroke of the given width in twips.
@@ -42,17 +41,23 @@ public:
     // Begins a new style block at the next edge: earlier selectors end, numbers start at 1 again.
     ShapeBuilder& NewStyles();
 
-    ShapeBuilder& Fill0(int selector);
-    ShapeBuilder& Fill1(int selector);
-    ShapeBuilder& Stroke(int selector);
+    ShapeBuilder& Fill0(int selector) { return Select(kFill0, selector); }
+    ShapeBuilder& Fill1(int selector) { return Select(kFill1, selector); }
+    ShapeBuilder& Stroke(int selector) { return Select(kLine, selector); }
     // All three selectors at once, the usual way to begin an outline.
-    ShapeBuilder& Styles(int fill0, int fill1, int line = 0);
+    ShapeBuilder& Styles(int fill0, int fill1, int line = 0)
+    {
+        return Fill0(fill0).Fill1(fill1).Stroke(line);
+    }
 
     ShapeBuilder& MoveTo(S32 x, S32 y);
     ShapeBuilder& LineTo(S32 x, S32 y);
     ShapeBuilder& CurveTo(S32 controlX, S32 controlY, S32 x, S32 y);
     ShapeBuilder& Close(); // a line back to the last MoveTo, unless the pen is there
-    ShapeBuilder& Rect(S32 xmin, S32 ymin, S32 xmax, S32 ymax);
+    ShapeBuilder& Rect(S32 xmin, S32 ymin, S32 xmax, S32 ymax)
+    {
+        return Polygon({{xmin, ymin}, {xmax, ymin}, {xmax, ymax}, {xmin, ymax}});
+    }
     ShapeBuilder& Circle(S32 x, S32 y, S32 radius) { return Ellipse(x, y, radius, radius); }
     ShapeBuilder& Ellipse(S32 x, S32 y, S32 radiusX, S32 radiusY); // eight pieces
     ShapeBuilder& Polygon(const std::vector<Pt>& corners);
@@ -62,22 +67,41 @@ public:
     // The style block and the records with their end mark.
     void Write(ByteWriter& out, bool alpha) const;
     // The records alone behind two 4-bit selector widths, as glyphs keep them.
-    void WriteGlyph(ByteWriter& out) const;
+    void WriteGlyph(ByteWriter& out) const { WriteRecords(out, false); }
 
 private:
+    enum Selector { kFill0, kFill1, kLine };
+    // The parts of a record that changes something, in the order of the wire. Those between are
+    // the selectors, kSelector << kFill0 and so on.
+    enum Part : U32 { kMove = 1, kSelector = 2, kNewStyles = 16 };
+    // One record as it goes out: a change of what its parts say, or an edge when it has none.
+    struct Record {
+        U32 parts = 0;
+        Pt move;
+        int selectors[3] = {0, 0, 0};
+        size_t block = 0;        // that follows, when there are new styles
+        std::vector<S32> deltas; // of a straight edge 2, of a curve 4
+    };
     struct Block {
         std::vector<Fill> fills;
         std::vector<Line> lines;
-        int topFill = 0, topLine = 0; // greatest selector used, table or not
-    };
-    struct Record {
-        enum Kind { kMove, kFill0, kFill1, kLine, kNewStyles, kStraight, kCurve } kind;
-        S32 x1 = 0, y1 = 0, x2 = 0, y2 = 0; // a selector or block number stands in x1
-    };
-    friend class ShapeRecordWriter;
+        int top[2] = {0, 0}; // greatest fill and line selector, used or in the table
 
-    void Add(Record::Kind kind, S32 x1, S32 y1 = 0, S32 x2 = 0, S32 y2 = 0);
+        int Bits(Selector which) const { return UnsignedBits(U32(top[which == kLine])); }
+        void WriteStyles(ByteWriter& out, bool alpha) const;
+        void WriteWidths(ByteWriter& out) const
+        {
+            out.Align().UB(4, U32(Bits(kFill0))).UB(4, U32(Bits(kLine)));
+        }
+        void WriteChange(ByteWriter& out, const Record& change) const;
+    };
+
+    int Raise(Selector which, size_t selector);
+    Record& Change(U32 part);
+    ShapeBuilder& Select(Selector which, int selector);
+    ShapeBuilder& AddEdge(const std::vector<S32>& deltas, Pt end);
     void Reach(Pt place);
+    void WriteRecords(ByteWriter& out, bool alpha) const;
 
     std::vector<Block> blocks{1};
     std::vector<Record> records;
