@@ -35,9 +35,14 @@ struct SLimits {
     U32 variables = 16384;
     // Bytes of a stream of variables; the rest is dropped.
     U32 variablesBytes = 4u << 20;
-    // Tags executed by one call that brings a timeline to a frame, nested placements included; then
-    // the call returns as if the data ended there.
+    // Tags that all timelines together execute in one tick, with whatever is charged like tags (long
+    // names, crowded depths, searches for labels). Then every timeline waits, as if its data ended
+    // there, and goes on from the same tag in the next tick.
     U32 tagsPerDraw = 4u << 20;
+    // Tags of one frame that a timeline executes in one go; it goes on in the next tick. As much of
+    // tagsPerDraw is kept for the oldest timeline, the player's own movie, whose turn comes last: it
+    // gets ahead in every tick, whatever its sprites do.
+    U32 tagsPerTimeline = 256u << 10;
     // Levels and movies loaded beside the root.
     U32 loadedMovies = 256;
 };

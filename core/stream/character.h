@@ -58,7 +58,8 @@ struct SSpritePart {
 
 // What a definition tag entered. Little is decoded when it is entered: `data` points at the rest of
 // the body inside the movie buffer. Records come zeroed from the dictionary's pool. One that leaves
-// the dictionary while something still shows it lives on until the last user lets go.
+// the dictionary while something still shows it lives on until the last user lets go;
+// with the movie every record dies, and objects that show one change to GoneCharacter.
 struct SCharacter {
     SCharacter* next;     // same chain of the dictionary
     SCharacter** link;    // what points at this record in its chain

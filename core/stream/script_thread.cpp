@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "core/display/display_list.h"
+#include "core/player/limits.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
@@ -62,25 +63,34 @@ S32 ScriptThread::DoTag()
         return kAtEnd;
     if (!HasBudget() || GetTag(len) < 0)
         return kNeedsData;
-    if (display)
-        display->tagsLeft--;
+    ChargeTags(1);
     Dispatch();
     pos = tagEnd;
     return scriptErr;
 }
 
+// All timelines draw on the tick's budget; its last share is for the oldest one.
 bool ScriptThread::HasBudget() const
 {
-    return !display || display->tagsLeft > 0;
+    if (!display)
+        return true;
+    const U32 kept = nextThread ? std::min(gLimits.tagsPerTimeline, gLimits.tagsPerDraw / 2) : 0;
+    return display->tagsLeft > kept;
 }
 
 // Takes work off the tick's budget of tags.
 void ScriptThread::ChargeWork(int units)
 {
     workDone += static_cast<U32>(units);
-    if (display)
-        display->tagsLeft -= std::min(display->tagsLeft, workDone / kWorkPerTag);
+    ChargeTags(workDone / kWorkPerTag);
     workDone %= kWorkPerTag;
+}
+
+void ScriptThread::ChargeTags(U32 tags)
+{
+    frameTags += tags;
+    if (display)
+        display->tagsLeft -= std::min(display->tagsLeft, tags);
 }
 
 void ScriptThread::Dispatch()
@@ -92,6 +102,7 @@ void ScriptThread::Dispatch()
     case kTagShowFrame:
         if (curFrame < kS32Max)
             curFrame++;
+        frameTags = 0;
         break;
     case kTagFrameLabel:
         label = PeekString();
@@ -118,8 +129,9 @@ void ScriptThread::Dispatch()
 S32 ScriptThread::DoTags(S32 frame)
 {
     S32 result = kDrawn;
+    frameTags = 0;
     while (curFrame < frame && result == kDrawn)
-        result = DoTag();
+        result = frameTags < gLimits.tagsPerTimeline ? DoTag() : S32(kNeedsData);
     return result;
 }
 

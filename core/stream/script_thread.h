@@ -60,9 +60,11 @@ public:
     ScriptThread& operator=(const ScriptThread&) = delete;
 
     // Executes one tag: kAtEnd when the timeline had ended, kNeedsData when the next tag is not all
-    // there (nothing is consumed), else scriptErr.
+    // there or the budget is spent (nothing is consumed), else scriptErr.
     S32 DoTag();
-    // DoTag while curFrame < frame and all goes well; the last result, 0 if nothing ran.
+    // DoTag while curFrame < frame and all goes well; the last result, 0 if nothing ran. The limits
+    // on tags end it with kNeedsData, perhaps in the middle of a frame; the next call goes on
+    // there.
     S32 DoTags(S32 frame);
     // Brings the timeline to `frame`. With `seek` the frames passed over run silently, and a frame
     // already passed is reached by replaying from the start; without it the tags just run on.
@@ -106,6 +108,7 @@ protected:
 private:
     bool HasBudget() const;
     void ChargeWork(int units);
+    void ChargeTags(U32 tags);
     bool IsLabel(const char* text, const char* name);
     void Dispatch();
     void DispatchDefinition();
@@ -147,6 +150,7 @@ private:
     void AddToBucket(SVariable* var);
     bool GrowIndex();
 
+    U32 frameTags = 0;             // tags executed of this frame in this go
     U32 workDone = 0;              // units of work not yet charged, less than a tag
     SVariable** buckets = nullptr; // name index, grown with the list; null while the list is short
     U32 bucketCount = 0;
