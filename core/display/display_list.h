@@ -176,6 +176,7 @@ private:
     ScriptPlayer* CloneMovie(const SCharacter* character);
     void NoteMask(const SObject* mask);
     void Empty(SObject* obj);
+    SObject* Unlink(SObject** link);
     void Discard(SObject* obj);
     bool KeepsOld(const SObject* old, const SObject* fresh) const;
     void TakeTransform(SObject* old, const SObject* fresh);

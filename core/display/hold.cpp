@@ -24,6 +24,7 @@ void DisplayList::BeginHold(SObject* parent)
     holdList = parent->bottomChild;
     holdSerial = nextSerial;
     parent->bottomChild = nullptr;
+    parent->passedChild = nullptr;
 }
 
 void DisplayList::FinishHold()

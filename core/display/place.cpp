@@ -43,13 +43,16 @@ bool DisplayList::MayPlace(const SObject* parent, const SCharacter* character) c
     return parent == nullptr;
 }
 
-// The link to the first child at or above the depth. Long searches use up the tick's budget of
+// The link to the first child at or above the depth. Tags mostly come by ascending depth, so a
+// search goes on from where the last one ended if it can. Long ones use up the tick's budget of
 // tags, so that crowded depths cannot stall it.
 SObject** DisplayList::FindLink(SObject* parent, U16 depth)
 {
     U32 passed = 0;
-    SObject** link = &parent->bottomChild;
+    SObject* last = parent->passedChild;
+    SObject** link = last && last->depth < depth ? &last->above : &parent->bottomChild;
     while (*link && (*link)->depth < depth) {
+        parent->passedChild = *link;
         link = &(*link)->above;
         passed++;
     }
@@ -200,8 +203,17 @@ void DisplayList::DoRemove(SObject** link)
     if (obj->drawn)
         InvalidateRect(&obj->devBounds);
     NoteMask(obj);
+    Discard(Unlink(link));
+}
+
+// Takes the object that *link points at out of its list.
+SObject* DisplayList::Unlink(SObject** link)
+{
+    SObject* obj = *link;
     *link = obj->above;
-    Discard(obj);
+    if (obj->parent->passedChild == obj)
+        obj->parent->passedChild = nullptr;
+    return obj;
 }
 
 void DisplayList::RemoveThisObject(SObject* obj)

@@ -113,8 +113,7 @@ void SObject::FreeCacheTree()
 void SObject::FreeChildren()
 {
     while (bottomChild) {
-        SObject* child = bottomChild;
-        bottomChild = child->above;
+        SObject* child = display->Unlink(&bottomChild);
         child->FreeChildren();
         if (child->drawn)
             display->InvalidateRect(&child->devBounds);

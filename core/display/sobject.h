@@ -29,6 +29,7 @@ struct SObject {
     SObject* parent;       // null for the root
     SObject* above;        // next higher sibling
     SObject* bottomChild;  // lowest child
+    SObject* passedChild;  // where a search of the children may start, for depths above its own
     SCharacter* character; // what is shown; null only for the root. Counted as a user of the record
     U16 depth;             // ordering key among siblings
     U16 ratio;             // morph ratio
@@ -52,7 +53,7 @@ struct SObject {
     U32 serial;            // never the same for two objects of one list: tells a recycled record
     SObject* nextAlive;    // links of the display list's objects
     SObject** aliveLink;
-    U16 nesting;           // number of parents
+    U16 nesting;    // number of parents
     U16 remaskFrom; // children of these depths were masked anew since the last recalculation: they
     U16 remaskTo;   // are to be repainted where they stand; none when remaskTo is 0
 
