@@ -28,32 +28,24 @@ inline std::vector<U8> MovingSquare(int frames, U16 rate = Fps(10))
     return movie.Bytes();
 }
 
-// The headless shell with a paint that takes its time and a count of what it was asked for.
-class CountingShell : public NativePlayerWnd {
+// The headless shell, playing a movie that is all there, with a paint that takes its time.
+class PlayingShell : public NativePlayerWnd {
 public:
-    CountingShell(S32 w = 0, S32 h = 0) : NativePlayerWnd(w, h) {}
-
-    void Open(const std::vector<U8>& movie)
+    explicit PlayingShell(const std::vector<U8>& movie, S32 w = 0, S32 h = 0)
+        : NativePlayerWnd(w, h)
     {
         Feed(movie.data(), movie.size());
         EndOfData();
     }
     void BltToScreen(const SRECT* r) override
     {
-        blits++;
         AdvanceHeadlessClock(blitCost * 1000);
-        NativePlayerWnd::BltToScreen(r);
+        blitted = *r;
     }
-    void ClearScreen() override { clears++; }
-    void ForgetRects()
-    {
-        RectSetEmpty(&blitted);
-        RectSetEmpty(&invalidated);
-    }
+    void ClearScreen() override { cleared = true; }
 
-    int blits = 0;
-    int clears = 0;
     S64 blitCost = 0; // milliseconds
+    bool cleared = false;
 };
 
 inline Picture Shot(NativePlayerWnd* player)
