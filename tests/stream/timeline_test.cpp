@@ -225,10 +225,11 @@ TEST(Clone, CopiesThePlacementButTheName)
     EXPECT_EQ(scene.Tree(), "3:9@50(1:1@1) 16390:9@50(1:1@1)") << "each runs on its own";
     scene.movie.Seek(0);
     scene.ExpectCopy(16390, "instance1", 0xFFFF); // what stood there is gone; it outlives the seek
-    scene.movie.FreeCharacter(U16(9));
-    scene.movie.CloneSprite(scene.At(3)->thread, scene.At(3)->name, 3); // over its own source
-    scene.ExpectCopy(3, "a", 0xFFFF);
-    EXPECT_EQ(scene.Tree(), "3:9@50(1:1) 16390:9@50(1:1@1)") << "only placements go back";
+    EXPECT_EQ(scene.Tree(), "3:9@50(1:1@1) 16390:9@50(1:1@1)") << "only placements go back";
+    NamedSprite alone;
+    alone.movie.FreeCharacter(U16(9)); // only the source itself still holds the character
+    alone.movie.CloneSprite(alone.At(3)->thread, alone.At(3)->name, 3);
+    alone.ExpectCopy(3, "a", 0xFFFF);
     scene.movie.CloneSprite(nullptr, "c", 1);
 }
 
