@@ -22,7 +22,8 @@ DisplayList::DisplayList()
     : root{}, backgroundColor(kWhite), dirtyArea{}, dirtyList{},
       edgeAlloc(sizeof(REdge), kEdgesPerBlock, 1, 0x22222222),
       objectAlloc(sizeof(SObject), kObjectsPerBlock, 1, 0x55555555),
-      colorAlloc(sizeof(RColor), kColorsPerBlock, 1, 0x44444444)
+      colorAlloc(sizeof(RColor), kColorsPerBlock, 1, 0x44444444),
+      threadAlloc(sizeof(ScriptThread), 16, 1, 0x66666666)
 {
     MatrixIdentity(&camera);
     cameraCxform.Clear();
@@ -143,6 +144,7 @@ void DisplayList::FreeCache()
     edgeAlloc.FreeEmpties();
     objectAlloc.FreeEmpties();
     colorAlloc.FreeEmpties();
+    threadAlloc.FreeEmpties();
     raster.FreeEmpties();
 }
 

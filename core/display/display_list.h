@@ -89,6 +89,7 @@ public:
     ChunkAlloc edgeAlloc;
     ChunkAlloc objectAlloc;
     ChunkAlloc colorAlloc;
+    ChunkAlloc threadAlloc; // timelines of sprites
 
     DisplayList();
     ~DisplayList();
@@ -172,6 +173,7 @@ private:
     void StartSprite(SObject* obj);
     void StartLoadedMovie(SObject* obj, const PlaceInfo* info);
     void StartButton(SObject* obj);
+    void EndTimeline(ScriptThread* thread);
     void AttachTimeline(SObject* obj, ScriptThread* thread);
     ScriptPlayer* CloneMovie(const SCharacter* character);
     void NoteMask(const SObject* mask);

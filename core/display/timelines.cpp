@@ -70,10 +70,11 @@ void DisplayList::AttachTimeline(SObject* obj, ScriptThread* thread)
 void DisplayList::StartSprite(SObject* obj)
 {
     const SCharacter* character = obj->character;
-    auto* thread = new (std::nothrow) ScriptThread;
+    void* memory = threadAlloc.Alloc();
     obj->thread = nullptr;
-    if (!thread)
+    if (!memory)
         return; // without memory the sprite stays empty
+    auto* thread = new (memory) ScriptThread;
     thread->ClearState();
     thread->player = character->player;
     thread->splayer = character->player->splayer;
@@ -137,7 +138,18 @@ void SObject::LeaveTimeline()
     own->rootObject = nullptr;
     if (character->type == kCharMovieRoot)
         return;
-    delete own;
+    display->EndTimeline(own);
+}
+
+// Sprites' timelines come from the pool, movies from the heap.
+void DisplayList::EndTimeline(ScriptThread* thread)
+{
+    if (thread->IsRoot()) {
+        delete thread;
+        return;
+    }
+    thread->~ScriptThread();
+    threadAlloc.Free(thread);
 }
 
 static SCharacter* ExchangeForGone(SCharacter* ch)

@@ -4,6 +4,28 @@
 #include <cstdlib>
 #include <cstring>
 
+// Under AddressSanitizer the items that nobody holds are marked, so that a use after Free is found
+// as it would be for memory from the heap.
+#if defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define __SANITIZE_ADDRESS__ 1
+#endif
+#endif
+#if defined(__SANITIZE_ADDRESS__)
+#include <sanitizer/asan_interface.h>
+static void MarkFree(void* p, size_t n)
+{
+    __asan_poison_memory_region(p, n);
+}
+static void MarkUsed(void* p, size_t n)
+{
+    __asan_unpoison_memory_region(p, n);
+}
+#else
+static void MarkFree(void*, size_t) {}
+static void MarkUsed(void*, size_t) {}
+#endif
+
 struct ChunkSlot {
     ChunkBlock* block; // where the slot lies
     ChunkSlot* next;   // next free slot while this one is free; the item's first word otherwise
@@ -61,6 +83,7 @@ void* ChunkAlloc::Alloc()
     if (!current && !CreateChunk())
         return nullptr;
     ChunkSlot* slot = current->freeList;
+    MarkUsed(slot, static_cast<size_t>(itemSize));
     current->freeList = slot->next;
     current->used++;
     return std::memset(ItemOf(slot), 0, static_cast<size_t>(itemSize) - kWord);
@@ -75,6 +98,7 @@ void ChunkAlloc::Free(void* item)
     assert(block->owner == this && block->used > 0);
     slot->next = block->freeList;
     block->freeList = slot;
+    MarkFree(ItemOf(slot), static_cast<size_t>(itemSize) - kWord);
     block->used--;
     if (block->used == 0 && !keepEmpties) {
         FreeChunk(block);
@@ -142,5 +166,6 @@ void ChunkAlloc::FreeChunk(ChunkBlock* block)
     if (oldest == block)
         oldest = block->next;
     blockCount--;
+    MarkUsed(block, kHeadSize + static_cast<size_t>(itemsPerChunk) * itemSize);
     std::free(block);
 }

@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "core/geom/chunk_alloc.h"
 #include "core/player/limits.h"
 
 namespace {
@@ -15,7 +16,17 @@ struct StrHead {
 // What the heap takes for a string beside its characters, the head included.
 constexpr size_t kHeapBytes = 32;
 
+// Instance names and most values are short, and sprites come and go in every frame: short strings,
+// head included, come from a pool of their own.
+constexpr size_t kShortBytes = 40;
+ChunkAlloc shortStrings(kShortBytes, 256, 1, 0x77777777);
+
 size_t liveBytes = 0;
+
+bool IsShort(size_t n)
+{
+    return sizeof(StrHead) + n + 1 <= kShortBytes;
+}
 
 U8 Fold(char c)
 {
@@ -28,7 +39,8 @@ char* NewStr(const char* s, size_t n)
     const size_t bytes = n + 1 + kHeapBytes;
     if (!ReserveStrBytes(bytes))
         return nullptr;
-    auto* head = static_cast<StrHead*>(std::malloc(sizeof(StrHead) + n + 1));
+    auto* head = static_cast<StrHead*>(IsShort(n) ? shortStrings.Alloc()
+                                                  : std::malloc(sizeof(StrHead) + n + 1));
     if (!head) {
         ReturnStrBytes(bytes);
         return nullptr;
@@ -64,7 +76,10 @@ void FreeStr(char* s)
         return;
     StrHead* head = reinterpret_cast<StrHead*>(s) - 1;
     ReturnStrBytes(head->bytes);
-    std::free(head);
+    if (IsShort(head->bytes - 1 - kHeapBytes))
+        shortStrings.Free(head);
+    else
+        std::free(head);
 }
 
 bool ReserveStrBytes(size_t bytes)
