@@ -170,20 +170,4 @@ TEST(Gradient, WithoutStopsWhatLiesBelowShows)
     }
 }
 
-TEST(Gradient, TransparentOnesBlendAlikeWithAndWithoutAntialiasing)
-{
-    MATRIX inv = {512 * 65536, 0, 0, 0, -16384 * 256, 0};
-    std::vector<U32> pictures[2];
-    for (int aa : {0, 1}) {
-        GradientScene s(64, 4, aa, kFillLinear, inv, {0, 255}, {SRGB{255, 0, 0, 0}, kWhite});
-        s.objects.emplace_front();
-        S32 k = aa ? 4 : 1;
-        RasterScene::Box(s.objects.front(), {0, 64 * k, 0, 4 * k}, s.Solid(0xFF0000FF));
-        s.Paint();
-        pictures[aa] = s.Pixels();
-        EXPECT_EQ(0xFF0000FFu, s.At(0, 0));
-    }
-    EXPECT_EQ(pictures[0], pictures[1]);
-}
-
 } // namespace

@@ -187,18 +187,6 @@ TEST(Raster, PiecesOfTheAreaEqualTheWhole)
         }
 }
 
-TEST(Raster, CoverageOfABoxWithinOnePixel)
-{
-    RasterScene s(4, 2, 1);
-    RasterScene::Box(s.NewObject(), {0, 16, 0, 8}, s.Solid(0xFF000000));
-    RasterScene::Box(s.NewObject(), {5, 7, 1, 4}, s.Solid(0xFFFFFFFF));
-    s.Paint();
-    // Two of four columns on three of four rows: 6 * 255 / 16 = 95.
-    EXPECT_EQ(0xFF000000u | 95 << 16 | 95 << 8 | 95, s.At(1, 0));
-    EXPECT_EQ(0xFF000000u, s.At(0, 0));
-    EXPECT_EQ(0xFF000000u, s.At(1, 1));
-}
-
 TEST(Raster, UncoveredPixelsBlendOverWhiteOrTheBackgroundBits)
 {
     RasterScene s(2, 1, 0);

@@ -103,30 +103,6 @@ TEST(Parser, TagHeadersWholeOrNotAtAll)
     }
 }
 
-TEST(Str, FoldsAsciiLettersAndReadsLeadingDigits)
-{
-    EXPECT_TRUE(StrEqual("Intro", "INTRO"));
-    for (const auto& [a, b] : {std::pair{"Intro", "Intr"},
-                               {"Intr", "Intro"},
-                               {"a[", "A{"},
-                               {"\xE4", "\xC4"},
-                               {nullptr, nullptr}})
-        EXPECT_FALSE(StrEqual(a, b));
-    EXPECT_EQ(StrHash("$Version"), StrHash("$vERSION"));
-    EXPECT_STREQ(SkipPrefix("_LEVEL12", "_level"), "12");
-    EXPECT_EQ(SkipPrefix("_lev", "_level"), nullptr);
-    const std::pair<const char*, S32> numbers[] = {
-        {"12ab", 12}, {"-5", 0}, {" 1", 0}, {"", 0}, {"007", 7}, {"4294967297", 1}, {"\xB2", 0}};
-    for (const auto& [text, value] : numbers)
-        EXPECT_EQ(ToInt(text), value) << text;
-    const std::string megabyte(1u << 20, 'x');
-    for (int i = 0; i < 80; i++) { // each takes its place in the 64 MiB that may be alive
-        char* copy = CreateStr(megabyte.c_str());
-        ASSERT_NE(copy, nullptr);
-        FreeStr(copy);
-    }
-}
-
 // The list goes through all forms of its index; whoever walks it sees the order of creation.
 TEST(Variables, FoldNamesKeepTheirOrderAndAreBounded)
 {
