@@ -301,11 +301,9 @@ TEST_F(Tool, WritesAllOrNothing)
         EXPECT_EQ(1, Run(words).code) << words;
     EXPECT_EQ(0, Run("render ../m -o l.png && [ -L l.png ]").code);
     EXPECT_EQ(100, Load("../x.png").width);
-    EXPECT_EQ(
-        0,
-        Shell(
-            "timeout 10 cmp f.png ../x.png & $vexel render ../m -o f.png; wait $! && [ -p f.png ]")
-            .code);
+    const char* pipe = "timeout 10 cmp f.png ../x.png & $vexel render ../m -o f.png; "
+                       "wait $! && [ -p f.png ]";
+    EXPECT_EQ(0, Shell(pipe).code);
 }
 
 } // namespace
