@@ -129,6 +129,8 @@ TEST(Screen, PaintsAndCopiesWhatItMust)
         EXPECT_TRUE(RectEqual(&whole, &player.blitted, 0));
         RectSetEmpty(&player.invalidated);
         player.FreeBuffer();
+        player.UpdateScreen();
+        EXPECT_TRUE(player.bits.HasBits());
         EXPECT_EQ("", ExpectSame(Shot(&player), before, "freed"));
         EXPECT_TRUE(RectEqual(&whole, &player.invalidated, 0));
         player.Tick();
