@@ -48,8 +48,6 @@ public:
 
     S32 ItemSize() const { return itemSize; }
     const ChunkBlock* First() const { return first; }
-    const ChunkBlock* Last() const { return last; }
-    const ChunkBlock* Current() const { return current; }
     size_t BlockCount() const { return blockCount; }
 
 private:

@@ -149,6 +149,8 @@ void CRaster::SortAll()
 // Edges with equal x keep their order.
 void CRaster::SortActive()
 {
+    if (!needsSort)
+        return;
     needsSort = false;
     size_t n = active.size();
     size_t allowed = 16 * n + 64;

@@ -100,6 +100,7 @@ void CRaster::PaintActive()
     RActiveRef* list = active.data();
     size_t n = active.size();
     size_t kept = 0;
+    S32 left = kS32Min; // crossing of the edge before, on the next scanline
     work += n;
     for (size_t i = 0; i < n; ++i) {
         RActiveEdge* e = list[i].edge;
@@ -112,6 +113,8 @@ void CRaster::PaintActive()
         }
         e->Step(y + 1);
         list[kept++] = {e->x, 0, e};
+        needsSort = needsSort || e->x < left;
+        left = e->x;
     }
     active.Truncate(kept);
     rowLost = rowLost || work >= workLimit;

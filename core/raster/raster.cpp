@@ -72,7 +72,6 @@ void CRaster::AddEdges(REdge* edges)
 {
     if (buckets.size() == 0 || !edges)
         return;
-    needsSort = true;
     for (REdge* e = edges; e; e = e->next) {
         if (e->anchor1y >= areaDev.ymax || e->anchor2y <= areaDev.ymin ||
             e->anchor1y >= e->anchor2y)

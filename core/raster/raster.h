@@ -84,7 +84,6 @@ public:
     // The area being painted, device units (quarter pixels when anti-aliased), half-open.
     const SRECT* AreaDev() const { return &areaDev; }
     int Antialias() const { return antialias; }
-    CBitBuffer* Output() const { return output; }
     S32 CurrentRow() const { return rowY; }
 
     void BeginPaint();
@@ -210,7 +209,7 @@ private:
     GrowBuffer<RActiveRef> active; // sorted by x once SortActive has run
     ChunkAlloc activeAlloc;
     ChunkAlloc rampAlloc;
-    bool needsSort = false;
+    bool needsSort = false; // some edge entered, or crossed the one before it
 
     U32 rowSerial = 0; // of the pixel row whose spans are being recorded
     GrowBuffer<RSpan> sublines[4];

@@ -65,6 +65,13 @@ TEST(Values, Numbers)
         {RectNearDistance(&kBox, Arg(SPOINT{-30, 50})), 50},
         {RectEqual(&low, &high, 100), false},
         {MatrixTransformThickness(&kThrice, 1000), 2150},
+        {FixedNearestMultiple(-8, 5), -10},
+        {FixedNearestMultiple(7, 5), 5},
+        {FixedTan(90 * kOne), 0}, // the cosine is exactly 0 there
+        {PointFastLength(Arg(SPOINT{-30, 40})), 55},
+        {RectOppositePoint(5) * 10 + RectOppositePoint(8), 78},
+        {RectPointIn(&kBox, Arg(SPOINT{10, 0})), true},
+        {RectPointIn(&kBox, Arg(SPOINT{11, 0})), false},
         {MatrixIsScaleOnly(Arg(MATRIX{kOne, 16, -16, 1, 9, 9})), true},
         {MatrixIsScaleOnly(Arg(MATRIX{kOne, 17, 0, 1, 0, 0})), false},
         {MatrixIsIdentity(Arg(MATRIX{kOne, 0, 0, kOne, 0, 1})), false},
