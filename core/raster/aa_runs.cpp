@@ -164,7 +164,7 @@ void CRaster::FlushPixels()
 void CRaster::EmitPixels(S32 x, const RGBI* src, S32 n, bool opaque)
 {
     if (opaque) {
-        ops->writeRow(rowBits, x, src, n);
+        ops->writeRow(outRow, x, src, n);
         return;
     }
     for (S32 i = 0, end; i < n; i = end + 1) {
@@ -197,7 +197,7 @@ void CRaster::PaintFlat(Lanes value, S32 x0, S32 x1)
 {
     // A few pixels go along with their neighbours.
     if (LaneAlpha(value) == 255 && x1 - x0 > 4) {
-        ops->fillRow(rowBits, x0, ops->pack(FromLanes(value)), x1 - x0);
+        ops->fillRow(outRow, x0, ops->pack(outRow, FromLanes(value)), x1 - x0);
         return;
     }
     for (S32 x = x0; x < x1; ++x)

@@ -2,46 +2,53 @@
 
 #include <algorithm>
 #include <cstdlib>
+#include <cstring>
 
 #include "core/player/limits.h"
 
-static U32 Pack32(const RGBI& c)
+static U32 Pack32(const CRow&, const RGBI& c)
 {
     return PackLanes(ToLanes(c));
 }
 
-static U32* Pixels32(U8* row, S32 x)
+static U32* Pixels32(const CRow& row, S32 x)
 {
-    return reinterpret_cast<U32*>(row) + x;
+    return reinterpret_cast<U32*>(row.bits) + x;
 }
 
-static void ReadRow32(const U8* row, S32 x, RGBI* dst, S32 n)
+static void ReadRow32(const CRow& row, S32 x, RGBI* dst, S32 n)
 {
-    const U32* src = reinterpret_cast<const U32*>(row) + x;
+    const U32* src = Pixels32(row, x);
     for (S32 i = 0; i < n; ++i)
         dst[i] = FromLanes(UnpackLanes(src[i]));
 }
 
-static void WriteRow32(U8* row, S32 x, const RGBI* src, S32 n)
+static void WriteRow32(const CRow& row, S32 x, const RGBI* src, S32 n)
 {
     U32* dst = Pixels32(row, x);
     for (S32 i = 0; i < n; ++i)
         dst[i] = PackLanes(ToLanes(src[i]));
 }
 
-static void FillRow32(U8* row, S32 x, U32 packed, S32 n)
+static void FillRow32(const CRow& row, S32 x, U32 packed, S32 n)
 {
     std::fill_n(Pixels32(row, x), n, packed);
 }
 
-static void RampRow32(U8* row, S32 x, const U32* ramp, const U16* index, S32 n)
+static void CopyRow32(const CRow& row, S32 x, const U32* src, S32 n)
+{
+    std::memcpy(Pixels32(row, x), src, size_t(n) * sizeof(U32));
+}
+
+static void RampRow32(const CRow& row, S32 x, const U32* ramp, const U16* index, S32 n)
 {
     U32* dst = Pixels32(row, x);
     for (S32 i = 0; i < n; ++i)
         dst[i] = ramp[index[i]];
 }
 
-static const CPixelOps kOps32 = {32, Pack32, ReadRow32, WriteRow32, FillRow32, RampRow32};
+static const CPixelOps kOps32 = {32,        Pack32,    ReadRow32, WriteRow32,
+                                 FillRow32, CopyRow32, RampRow32};
 
 const CPixelOps* PixelOps(CPixelFormat)
 {

@@ -10,17 +10,30 @@ enum CPixelFormat : S32 {
     kPixel32 = 0, // one native word a << 24 | r << 16 | g << 8 | b, premultiplied
 };
 
+struct CPalette;
+
+// A row of pixels and what writing it takes besides.
+struct CRow {
+    U8* bits = nullptr; // column 0
+    S32 y = 0;          // row of the picture, from the top: dither patterns hang on it
+    const CPalette* palette = nullptr; // of a palette format
+    S16* errors = nullptr;     // with error diffusion: what the row above left for each channel of
+                               // each column, blue first, one pixel more on both sides
+    S16* nextErrors = nullptr; // ... and what this row leaves for the one below
+};
+
 // What a format can do with `n` pixels from column x of a row. Sources are premultiplied.
 struct CPixelOps {
     int bitsPerPixel;
-    // A colour as the format stores it, for fillRow.
-    U32 (*pack)(const RGBI& c);
-    void (*readRow)(const U8* row, S32 x, RGBI* dst, S32 n);
-    void (*writeRow)(U8* row, S32 x, const RGBI* src, S32 n);
-    void (*fillRow)(U8* row, S32 x, U32 packed, S32 n);
-    // `n` opaque pixels given as words a << 24 | r << 16 | g << 8 | b through an index row:
-    // pixel i is ramp[index[i]].
-    void (*rampRow)(U8* row, S32 x, const U32* ramp, const U16* index, S32 n);
+    // A colour as the format stores it, for fillRow. Of `row` only the palette counts.
+    U32 (*pack)(const CRow& row, const RGBI& c);
+    void (*readRow)(const CRow& row, S32 x, RGBI* dst, S32 n);
+    void (*writeRow)(const CRow& row, S32 x, const RGBI* src, S32 n);
+    void (*fillRow)(const CRow& row, S32 x, U32 packed, S32 n);
+    // `n` opaque pixels given as words a << 24 | r << 16 | g << 8 | b.
+    void (*copyRow)(const CRow& row, S32 x, const U32* src, S32 n);
+    // The same through an index row: pixel i is ramp[index[i]].
+    void (*rampRow)(const CRow& row, S32 x, const U32* ramp, const U16* index, S32 n);
 };
 
 // The operations of a format; never null.
@@ -52,6 +65,8 @@ public:
     // Row y counted from the top of the picture, 0 <= y < Height().
     U8* RowAddr(S32 y) { return base + size_t(bottomUp ? height - 1 - y : y) * rowBytes; }
     const U8* RowAddr(S32 y) const { return const_cast<CBitBuffer*>(this)->RowAddr(y); }
+    // The same with what the operations need besides; without error diffusion.
+    CRow Row(S32 y) { return {RowAddr(y), y}; }
     // Row y of a 32-bit buffer.
     const U32* Row32(S32 y) const { return reinterpret_cast<const U32*>(RowAddr(y)); }
 

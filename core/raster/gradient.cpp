@@ -251,7 +251,7 @@ void DrawGradientSlab(RColor* color, S32 x0, S32 x1)
 {
     CRaster* raster = color->raster;
     ForPieces(color, x0, x1, [=](const U16* index, S32 x, S32 n) {
-        raster->Ops()->rampRow(raster->RowBits(), x, color->builtRamp, index, n);
+        raster->Ops()->rampRow(raster->Row(), x, color->builtRamp, index, n);
     });
 }
 

@@ -100,18 +100,20 @@ void CRaster::AddEdges(REdge* edges, RColor* colors, RColor* clip)
     layersFull = layer == 0;
 }
 
-void CRaster::SetYCoord(S32 row)
+void CRaster::SetYCoord(S32 y0)
 {
-    rowY = row;
-    rowBits = output->RowAddr(row);
+    rowY = y0;
+    outRow = output->Row(y0);
 }
 
 void CRaster::FillBackground(SRGB color)
 {
     RGBI value = {color.blue, color.green, color.red, color.alpha};
     Premultiply(&value);
-    for (S32 row = area.ymin; row < area.ymax; ++row)
-        ops->fillRow(output->RowAddr(row), area.xmin, ops->pack(value), area.xmax - area.xmin);
+    for (S32 y0 = area.ymin; y0 < area.ymax; ++y0) {
+        const CRow at = output->Row(y0);
+        ops->fillRow(at, area.xmin, ops->pack(at, value), area.xmax - area.xmin);
+    }
 }
 
 void CRaster::PaintBits()

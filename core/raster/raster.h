@@ -114,7 +114,7 @@ public:
     void SetAntialias(int on) { antialias = on; }
 
     // --- for the paint procedures of the colours ---
-    U8* RowBits() const { return rowBits; }
+    const CRow& Row() const { return outRow; }
     const CPixelOps* Ops() const { return ops; }
 
 private:
@@ -189,7 +189,7 @@ private:
     CBitBuffer* output = nullptr;
     CBitBuffer* backgroundBits = nullptr;
     const CPixelOps* ops;
-    U8* rowBits = nullptr;
+    CRow outRow; // the current one
     S32 rowY = 0; // current pixel row
     int antialias = 0;
     bool alphaOutput = false;

@@ -14,7 +14,7 @@ static void BuildNothing(RColor*, S32, S32, RGBI*) {}
 static void DrawSolidSlab(RColor* color, S32 x0, S32 x1)
 {
     CRaster* raster = color->raster;
-    raster->Ops()->fillRow(raster->RowBits(), x0, color->rgbPixel, x1 - x0);
+    raster->Ops()->fillRow(raster->Row(), x0, color->rgbPixel, x1 - x0);
 }
 
 static void BuildSolidSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
@@ -80,7 +80,7 @@ void RColor::BuildCache()
         skipped = !BuildGradientCache(this);
         transparent = transparent || skipped;
     } else if (colorType == kColorSolid) {
-        rgbPixel = raster->Ops()->pack(rgb);
+        rgbPixel = raster->Ops()->pack(raster->Row(), rgb);
         drawSlabProc = DrawSolidSlab;
         buildSlabProc = transparent ? CompositeSolidSlab : BuildSolidSlab;
     }

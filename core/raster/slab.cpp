@@ -20,7 +20,7 @@ void CRaster::CompositeSlab(S32 x0, S32 x1, RColor* const* colors, int count)
             ReadBackground(x, n, piece);
         for (int i = count - 1; i >= 0; --i)
             colors[i]->buildSlabProc(colors[i], x, x + n, piece);
-        ops->writeRow(rowBits, x, piece, n);
+        ops->writeRow(outRow, x, piece, n);
     }
 }
 
@@ -28,7 +28,7 @@ void CRaster::ReadBackground(S32 x, S32 n, RGBI* dst) const
 {
     if (BackgroundCovers()) {
         S32 inside = std::clamp(backgroundBits->Width() - x, 0, n);
-        backgroundBits->Ops()->readRow(backgroundBits->RowAddr(rowY), x, dst, inside);
+        backgroundBits->Ops()->readRow(backgroundBits->Row(rowY), x, dst, inside);
         dst += inside;
         n -= inside;
     }
@@ -49,6 +49,6 @@ void CRaster::BlendToOutput(S32 x, const RGBI* src, S32 n)
         S32 count = std::min(kPiece, n - done);
         ReadBackground(x + done, count, background);
         CompositeRGB(src + done, background, count);
-        ops->writeRow(rowBits, x + done, background, count);
+        ops->writeRow(outRow, x + done, background, count);
     }
 }

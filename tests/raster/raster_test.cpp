@@ -196,7 +196,7 @@ TEST(Raster, UncoveredPixelsBlendOverWhiteOrTheBackgroundBits)
     EXPECT_EQ(127, int(s.At(0, 0) & 0xFF)); // white * 128 >> 8
     CBitBuffer under;
     under.CreateScreenBits(1, 1);
-    under.Ops()->fillRow(under.RowAddr(0), 0, 0xFF0000FF, 1);
+    under.Ops()->fillRow(under.Row(0), 0, 0xFF0000FF, 1);
     s.raster.SetBackgroundBits(&under);
     s.Paint();
     EXPECT_EQ(0xFF80007Fu, s.At(0, 0));
