@@ -3,6 +3,7 @@
 
 #include "core/display/display_list.h"
 #include "core/shape/character_parser.h"
+#include "core/shape/text_records.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
@@ -74,20 +75,40 @@ void SObject::CalcDevBounds(const MATRIX* mat)
     MatrixTransformRect(mat, &bounds, &devBounds);
 }
 
-// Kept apart from Draw: the parser's tables would stand on the stack once per level of the tree.
 // Half a shape would bleed over the picture, so one that the budget cuts short is not drawn at all.
 void SObject::BuildEdges(const STransform* placed)
 {
-    if (built || !character || character->type != kCharShape || display->recordsLeft == 0)
+    if (built || !character || display->recordsLeft == 0)
         return;
-    SCharacterParser parser(this, character->player, character->data, character->DataLen(), 0,
-                            &placed->mat);
-    parser.getAlpha = character->tagCode == kTagDefineShape3;
-    parser.cxform = placed->cxform;
-    parser.BuildEdges(true, &devBounds);
+    switch (character->type) {
+    case kCharShape:
+    case kCharMorphShape:
+        BuildShapeEdges(placed);
+        break;
+    case kCharText:
+        BuildTextEdges(this, placed);
+        break;
+    default:
+        return;
+    }
     built = display->recordsLeft != 0;
     if (!built)
         FreeCache();
+}
+
+// Kept apart from Draw: the parser's tables would stand on the stack once per level of the tree.
+void SObject::BuildShapeEdges(const STransform* placed)
+{
+    SCharacterParser parser(this, character->player, character->data, character->DataLen(), 0,
+                            &placed->mat);
+    const bool isMorph = character->type == kCharMorphShape;
+    parser.getAlpha = isMorph || character->tagCode == kTagDefineShape3;
+    parser.cxform = placed->cxform;
+    parser.ratio = ratio;
+    if (isMorph)
+        parser.BuildMorphEdges(&devBounds);
+    else
+        parser.BuildEdges(true, &devBounds);
 }
 
 void SObject::FreeCache()

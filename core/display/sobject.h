@@ -95,6 +95,7 @@ struct SObject {
     bool IsClip() const { return clipDepth != 0; }
 
 private:
+    void BuildShapeEdges(const STransform* placed);
     void Recalculate(const MATRIX* mat);
     void InvalidateRemasked();
     void InvalidateDrawn();

@@ -62,7 +62,7 @@ bool SCharacterParser::BuildEdges(bool readStyles, const SRECT* devBounds)
     hugeCoords = OutgrowsEdges(*devBounds);
     raster = PaintedRaster(display);
     if (readStyles) {
-        if (!GetStyles())
+        if (!(endEdges ? GetMorphStyles() : GetStyles()))
             return false;
         if (obj->IsClip())
             MakeClipper();
@@ -76,7 +76,7 @@ bool SCharacterParser::BuildEdges(bool readStyles, const SRECT* devBounds)
 void SCharacterParser::Walk()
 {
     CURVE c;
-    for (int flags = GetEdge(&c); flags != kEndOfShape; flags = GetEdge(&c)) {
+    for (int flags = NextRecord(&c); flags != kEndOfShape; flags = NextRecord(&c)) {
         if (!SpendRecord())
             return;
         if (flags == 0) {

@@ -25,6 +25,8 @@ public:
     // Builds all edges; `devBounds` are the instance's. Without `readStyles` only the selector
     // widths are read. False when the styles could not be read.
     bool BuildEdges(bool readStyles, const SRECT* devBounds);
+    // The same for a morph shape at `ratio`, from the distance to its end edges on.
+    bool BuildMorphEdges(const SRECT* devBounds);
     // Adds one curve.
     void AddCurve(const CURVE* c);
     // Turns the style tables into a mask: one clip colour in place of every fill, no lines.
@@ -32,14 +34,18 @@ public:
 
 private:
     void Walk();
+    int NextRecord(CURVE* c) { return endEdges ? NextMorphRecord(c) : GetEdge(c); }
+    int NextMorphRecord(CURVE* c);
+    bool NextEndEdge(CURVE* c);
     void ChangeFills();
     void SplitAtTurn(const CURVE& c);
     void SplitAtMiddle(const CURVE& c);
     void AddHalves(const CURVE& first, const CURVE& second);
     void AddPiece(CURVE* c);
 
-    bool edgesLost = false;      // the edge pool is exhausted: nothing is split any more
-    RColor* clipColor = nullptr; // of the whole mask, made once
+    bool edgesLost = false;           // the edge pool is exhausted: nothing is split any more
+    RColor* clipColor = nullptr;      // of the whole mask, made once
+    SShapeParser* endEdges = nullptr; // of a morph: the end list, while both are walked
 };
 
 // Makes a clip colour and pushes it on `list`; null when the colour pool is exhausted.

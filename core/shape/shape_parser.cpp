@@ -70,10 +70,6 @@ private:
     SParser* parser;
 };
 
-S32 Halfway(S32 a, S32 b)
-{
-    return S32((S64(a) + b) >> 1);
-}
 } // namespace
 
 SShapeParser::SShapeParser(ScriptPlayer* dictionary, DisplayList* list, RColor** colors,
@@ -108,21 +104,27 @@ void SShapeParser::SetOnlyFill(RColor* color)
 
 void SShapeParser::GetSelectorWidths()
 {
+    styleless = true;
+    ReadSelectorWidths();
+}
+
+void SShapeParser::ReadSelectorWidths()
+{
     InitBits();
     nFillBits = S32(GetBits(4));
     nLineBits = S32(GetBits(4));
 }
 
-// What follows the edge flag.
+// What follows the edge flag. The control point of a straight edge is left to the caller.
 template <typename Bits> void SShapeParser::ReadEdge(Bits& bits, CURVE* c)
 {
     const bool straight = bits.Take(1) != 0;
     const S32 n = S32(bits.Take(4)) + 2;
-    c->anchor1 = curPtX;
+    c->anchor1 = curPt;
     if (!straight) {
         curPt.x += bits.TakeSigned(n);
         curPt.y += bits.TakeSigned(n);
-        MatrixTransformPoint(&mat, &curPt, &c->control);
+        c->control = curPt;
     }
     const bool general = !straight || bits.Take(1) != 0;
     const bool vertical = !general && bits.Take(1) != 0;
@@ -130,14 +132,11 @@ template <typename Bits> void SShapeParser::ReadEdge(Bits& bits, CURVE* c)
         curPt.x += bits.TakeSigned(n);
     if (general || vertical)
         curPt.y += bits.TakeSigned(n);
-    MatrixTransformPoint(&mat, &curPt, &curPtX);
-    c->anchor2 = curPtX;
+    c->anchor2 = curPt;
     c->isLine = straight;
-    if (straight)
-        c->control = {Halfway(c->anchor1.x, curPtX.x), Halfway(c->anchor1.y, curPtX.y)};
 }
 
-int SShapeParser::GetEdge(CURVE* c)
+inline int SShapeParser::ReadRecord(CURVE* c)
 {
     if (limit - pos >= kEdgeBytes) {
         QuickBits bits(*this);
@@ -152,6 +151,29 @@ int SShapeParser::GetEdge(CURVE* c)
     PlainBits bits(this);
     ReadEdge(bits, c);
     return 0;
+}
+
+int SShapeParser::GetEdge(CURVE* c)
+{
+    const int flags = ReadRecord(c);
+    if (flags != 0)
+        return flags;
+    c->anchor1 = curPtX;
+    if (!c->isLine)
+        MatrixTransformPoint(&mat, &c->control, &c->control);
+    MatrixTransformPoint(&mat, &curPt, &curPtX);
+    c->anchor2 = curPtX;
+    if (c->isLine)
+        PointMiddle(&c->anchor1, &c->anchor2, &c->control);
+    return 0;
+}
+
+int SShapeParser::GetShapeEdge(CURVE* c)
+{
+    const int flags = ReadRecord(c);
+    if (flags == 0 && c->isLine)
+        PointMiddle(&c->anchor1, &c->anchor2, &c->control);
+    return flags;
 }
 
 // The selectors have the widths of the old style block even where a new one follows.
@@ -174,7 +196,7 @@ int SShapeParser::ReadStyleChange()
         line = GetBits(nLineBits);
     if (flags & kNewStyles) {
         layer += nLines + nFills;
-        if (!ReadStyleBlock())
+        if (styleless || !ReadStyleBlock())
             return kEndOfShape;
     }
     return flags;

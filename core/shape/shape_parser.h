@@ -63,11 +63,15 @@ public:
     bool GetStyles();
     // The same for a morph style block, each pair interpolated at `ratio`.
     bool GetMorphStyles();
-    // Reads the two selector widths alone: for glyphs, whose colours the caller has set.
+    // Begins a list without styles of its own, a glyph or a morph's end list: reads the two
+    // selector widths alone. New styles in such a list end it.
     void GetSelectorWidths();
     // Reads one record: 0 for an edge, which fills `c`; kEndOfShape at the end; else the flags of a
     // style change, already applied.
     int GetEdge(CURVE* c);
+    // The same with the edge in shape coordinates, as a straight one's control point the middle of
+    // its anchors. `curPtX` does not follow it.
+    int GetShapeEdge(CURVE* c);
 
     // The colour of a fill selector; null for 0 and for a selector beyond the table.
     RColor* Fill(U32 selector) const { return selector <= nFills ? fillIndex[selector] : nullptr; }
@@ -102,16 +106,18 @@ private:
     void ReadSolid(RColor* color);
     U16 ReadWidth();
     void ReadFillMatrix(MATRIX* m);
-    void FinishSolid(RColor* color);
 
     // shape_parser.cpp
     template <typename Bits> void ReadEdge(Bits& bits, CURVE* c);
+    int ReadRecord(CURVE* c);
+    void ReadSelectorWidths();
     void SetPen(const SPOINT& pen);
     int ReadStyleChange();
 
     void InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const;
 
     bool morphStyles = false; // styles are pairs, also where they are renewed inside the records
+    bool styleless = false;   // a list that cannot renew its styles
     // The tables stay as they are until a count sizes them: clearing them would cost more than
     // reading a small shape.
     RColor* inlineFills[kInlineStyles];
@@ -119,3 +125,8 @@ private:
     GrowBuffer<RColor*> heapFills; // in place of the inline tables when they are too small
     GrowBuffer<SLineStyle> heapLines;
 };
+
+// Makes a solid colour of a value from a movie, under the instance's transform, for objects whose
+// colours stand in no style block, and pushes it on `list`. Null when the colour pool is exhausted.
+RColor* CreateSolidColor(DisplayList* display, RColor** list, SRGB value,
+                         const ColorTransform& cxform, U32 order);

@@ -12,6 +12,15 @@ S32 Between(S32 start, S32 end, U16 ratio)
 {
     return S32(start + ((S64(end) - start) * ratio >> 16));
 }
+
+// The transform works on what the file says, so premultiplying comes after it.
+void FinishSolid(RColor* color, const ColorTransform& cxform)
+{
+    if (cxform.flags != 0)
+        cxform.Apply(&color->rgb, 1);
+    color->transparent = color->rgb.alpha < 255;
+    Premultiply(&color->rgb);
+}
 } // namespace
 
 bool SShapeParser::GetStyles()
@@ -35,7 +44,7 @@ bool SShapeParser::ReadStyleBlock()
     // The widths end every block, so that one without them is cut short.
     if (pos >= limit)
         return false;
-    GetSelectorWidths();
+    ReadSelectorWidths();
     return true;
 }
 
@@ -220,14 +229,23 @@ void SShapeParser::ReadSolid(RColor* color)
         GetColor(&end, getAlpha);
         Interpolate(&color->rgb, &end, ratio, &color->rgb);
     }
-    FinishSolid(color);
+    FinishSolid(color, cxform);
 }
 
-// The transform works on what the file says, so premultiplying comes after it.
-void SShapeParser::FinishSolid(RColor* color)
+RColor* CreateSolidColor(DisplayList* display, RColor** list, SRGB value,
+                         const ColorTransform& cxform, U32 order)
 {
-    if (cxform.flags != 0)
-        cxform.Apply(&color->rgb, 1);
-    color->transparent = color->rgb.alpha < 255;
-    Premultiply(&color->rgb);
+    RColor* color = display->NewColor();
+    if (!color)
+        return nullptr;
+    CRaster* raster = display->bits && display->bits->HasBits() ? &display->raster : nullptr;
+    color->SetUp(raster);
+    color->order = order;
+    color->nextColor = *list;
+    *list = color;
+    color->rgb = {value.blue, value.green, value.red, value.alpha};
+    FinishSolid(color, cxform);
+    if (raster)
+        color->BuildCache();
+    return color;
 }

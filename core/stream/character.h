@@ -38,6 +38,7 @@ struct SButtonPart {
 
 struct SFontPart {
     const U8* info; // body of the font information record, null when none
+    S32 infoLen;    // bytes from `info` to the end of its tag
     void* cache;    // cleared; for whoever shows text
     U16 glyphCount; // with-layout form only, else 0
     U16 flags;      // the with-layout form's first word, else 0

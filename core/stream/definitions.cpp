@@ -207,8 +207,10 @@ SCharacter* ScriptThread::DefinedCharacter(U8 type)
 void ScriptThread::DefineFontInfo()
 {
     SCharacter* ch = DefinedCharacter(kCharFont);
-    if (ch && !ch->font.info)
-        ch->font.info = script + pos;
+    if (!ch || ch->font.info)
+        return;
+    ch->font.info = script + pos;
+    ch->font.infoLen = tagEnd > pos ? tagEnd - pos : 0;
 }
 
 void ScriptThread::DefineButtonExtra()

@@ -124,17 +124,26 @@ void ShapeBuilder::Reach(Pt place)
              std::min(reach.ymin, place.y), std::max(reach.ymax, place.y)};
 }
 
-static void WriteFill(ByteWriter& out, const Fill& fill, bool alpha)
+// What a style says, and behind each part of it the end value of a morph's where there is one.
+static void WriteFill(ByteWriter& out, const Fill& fill, bool alpha, const Fill* end)
 {
     out.PutU8(fill.type);
-    if (fill.type & 0x10) {
-        out.PutMatrix(fill.mat).PutU8(U32(fill.stops.size()));
-        for (const Stop& stop : fill.stops)
-            out.PutU8(stop.ratio).PutColor(stop.color, alpha);
-    } else if (fill.type & 0x40) {
-        out.PutU16(fill.bitmap).PutMatrix(fill.mat);
-    } else {
+    if (!(fill.type & 0x50)) {
         out.PutColor(fill.color, alpha);
+        return end ? void(out.PutColor(end->color, alpha)) : void();
+    }
+    if (!(fill.type & 0x10))
+        out.PutU16(fill.bitmap);
+    out.PutMatrix(fill.mat);
+    if (end)
+        out.PutMatrix(end->mat);
+    if (!(fill.type & 0x10))
+        return;
+    out.PutU8(U32(fill.stops.size()));
+    for (size_t i = 0; i < fill.stops.size(); i++) {
+        for (const Fill* f : {&fill, end})
+            if (f)
+                out.PutU8(f->stops[i].ratio).PutColor(f->stops[i].color, alpha);
     }
 }
 
@@ -143,14 +152,20 @@ static void WriteCount(ByteWriter& out, size_t count)
     count < 0xFF ? out.PutU8(U32(count)) : out.PutU8(0xFF).PutU16(U32(count));
 }
 
-void ShapeBuilder::Block::WriteStyles(ByteWriter& out, bool alpha) const
+void ShapeBuilder::Block::WriteStyles(ByteWriter& out, bool alpha, const Block* end) const
 {
     WriteCount(out, fills.size());
-    for (const Fill& fill : fills)
-        WriteFill(out, fill, alpha);
+    for (size_t i = 0; i < fills.size(); i++)
+        WriteFill(out, fills[i], alpha, end ? &end->fills[i] : nullptr);
     WriteCount(out, lines.size());
-    for (const Line& line : lines)
-        out.PutU16(line.width).PutColor(line.color, alpha);
+    for (size_t i = 0; i < lines.size(); i++) {
+        out.PutU16(lines[i].width);
+        if (end)
+            out.PutU16(end->lines[i].width);
+        out.PutColor(lines[i].color, alpha);
+        if (end)
+            out.PutColor(end->lines[i].color, alpha);
+    }
 }
 
 void ShapeBuilder::Block::WriteChange(ByteWriter& out, const Record& change) const
@@ -180,7 +195,7 @@ static void WriteEdge(ByteWriter& out, const std::vector<S32>& deltas)
     }
 }
 
-void ShapeBuilder::WriteRecords(ByteWriter& out, bool alpha) const
+void ShapeBuilder::WriteRecords(ByteWriter& out, bool alpha, const ShapeBuilder* end) const
 {
     const Block* block = &blocks[0];
     block->WriteWidths(out);
@@ -191,7 +206,7 @@ void ShapeBuilder::WriteRecords(ByteWriter& out, bool alpha) const
             block->WriteChange(out, record);
         if (record.parts & kNewStyles) {
             block = &blocks[record.block];
-            block->WriteStyles(out, alpha);
+            block->WriteStyles(out, alpha, end ? &end->blocks[record.block] : nullptr);
             block->WriteWidths(out);
         }
     }
@@ -200,6 +215,26 @@ void ShapeBuilder::WriteRecords(ByteWriter& out, bool alpha) const
 
 void ShapeBuilder::Write(ByteWriter& out, bool alpha) const
 {
-    blocks[0].WriteStyles(out, alpha);
+    blocks[0].WriteStyles(out, alpha, nullptr);
     WriteRecords(out, alpha);
+}
+
+void ShapeBuilder::WriteMorph(ByteWriter& out, const ShapeBuilder& end) const
+{
+    blocks[0].WriteStyles(out, true, &end.blocks[0]);
+    WriteRecords(out, true, &end);
+}
+
+void ShapeBuilder::WriteMorphEnd(ByteWriter& out) const
+{
+    const Block bare; // selectors of no bits, which say nothing
+    bare.WriteWidths(out);
+    for (Record record : records) {
+        record.parts &= ~U32(kNewStyles);
+        if (!record.deltas.empty())
+            WriteEdge(out, record.deltas);
+        else if (record.parts != 0)
+            bare.WriteChange(out, record);
+    }
+    out.UB(6, 0).Align();
 }
