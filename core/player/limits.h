@@ -8,8 +8,20 @@
 struct SLimits {
     // Declared movie length. A longer one is an out-of-memory error of the loader: nothing plays.
     U32 movieBytes = 256u << 20;
-    // Pixels of one bitmap and of a drawing surface. A larger one is not created.
+    // Pixels of a drawing surface. A larger one is not created.
     U32 surfacePixels = 64u << 20;
+    // Pixels of one image, which take up to 4 bytes each. A larger one is not decoded: fills with
+    // it show its fallback colour.
+    U32 bitmapPixels = 64u << 20;
+    // Decoded pixels of one movie, and of all movies of the process. When an image would exceed
+    // either, its movie's unused pixels are dropped; then it is refused as if it were too large.
+    U32 movieBitmapPixels = 64u << 20;
+    U32 allBitmapPixels = 128u << 20;
+    // Bytes that one JPEG image may take while it is decoded. An image in several scans, whose
+    // coefficients are all kept until the last, may need more than that and is then not decoded.
+    U32 jpegBytes = 192u << 20;
+    // Pixels of a JPEG image times its scans: as many of the scans are decoded as this allows.
+    U32 jpegScanPixels = 512u << 20;
     // Display objects inside one another. A deeper one is not placed.
     S32 nesting = 128;
     // Display objects alive in one display list. Further ones are not placed.
@@ -35,13 +47,13 @@ struct SLimits {
     U32 variables = 16384;
     // Bytes of a stream of variables; the rest is dropped.
     U32 variablesBytes = 4u << 20;
-    // Tags that all timelines together execute in one tick, with whatever is charged like tags (long
-    // names, crowded depths, searches for labels). Then every timeline waits, as if its data ended
-    // there, and goes on from the same tag in the next tick.
+    // Tags that all timelines together execute in one tick, with whatever is charged like tags
+    // (long names, crowded depths, searches for labels). Then every timeline waits, as if its data
+    // ended there, and goes on from the same tag in the next tick.
     U32 tagsPerDraw = 4u << 20;
     // Tags of one frame that a timeline executes in one go; it goes on in the next tick. As much of
-    // tagsPerDraw is kept for the oldest timeline, the player's own movie, whose turn comes last: it
-    // gets ahead in every tick, whatever its sprites do.
+    // tagsPerDraw is kept for the oldest timeline, the player's own movie, whose turn comes last:
+    // it gets ahead in every tick, whatever its sprites do.
     U32 tagsPerTimeline = 256u << 10;
     // Levels and movies loaded beside the root.
     U32 loadedMovies = 256;
