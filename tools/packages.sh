@@ -10,10 +10,12 @@ missing_packages() {
     command -v ninja >/dev/null || echo ninja-build
     if command -v pkg-config >/dev/null; then
         pkg-config --exists libpng || echo libpng-dev
+        pkg-config --exists libgif || echo libgif-dev
         pkg-config --exists zlib || echo zlib1g-dev
+        pkg-config --exists libjpeg || echo libjpeg-dev
         [[ ${1:-} != test ]] || pkg-config --exists gtest || echo libgtest-dev
     else
-        echo libpng-dev zlib1g-dev ${1:+libgtest-dev}
+        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev ${1:+libgtest-dev}
     fi
 }
 

@@ -17,7 +17,7 @@ enum SSoundCompression : U8 {
 constexpr U16 kEditOwnGlyphs = 0x0100; // drawn with the movie's font, not with a device font
 } // namespace
 
-// Codes without a case are skipped: unknown ones, and those of sounds, actions and image tables.
+// Codes without a case are skipped: unknown ones, and those of sounds and actions.
 void ScriptThread::DispatchDefinition()
 {
     switch (tagCode) {
@@ -33,6 +33,8 @@ void ScriptThread::DispatchDefinition()
     case kTagDefineBitsLossless:
     case kTagDefineBitsLossless2:
         return DefineBits();
+    case kTagDefineJPEGTables:
+        return DefineJPEGTables();
     case kTagDefineButton:
     case kTagDefineButton2:
         return DefineButton();
@@ -106,6 +108,16 @@ void ScriptThread::DefineBits()
     ch->bitmap.PIInit();
     pos = tagStart;
     KeepBody(ch);
+}
+
+// Once a movie. The tables are read before each image that shares them, so that an image looks the
+// same whatever tables others have brought along.
+void ScriptThread::DefineJPEGTables()
+{
+    if (!player || player->jpegInfo)
+        return;
+    player->jpegInfo = script + pos;
+    player->jpegInfoLen = tagEnd - pos;
 }
 
 void ScriptThread::DefineButton()

@@ -6,6 +6,8 @@
 #include "core/stream/script_player.h"
 
 namespace {
+U64 allPixels = 0; // decoded, of all movies
+
 S32 ChainOf(U16 id)
 {
     return id & (ScriptPlayer::kChains - 1);
@@ -97,7 +99,7 @@ void ScriptPlayer::FreeCharacter(SCharacter* ch)
 void ScriptPlayer::DestroyCharacter(SCharacter* ch)
 {
     if (ch->type == kCharBitmap)
-        ch->bitmap.PIFree();
+        DropPixels(ch);
     characterCount--;
     charAlloc.Free(ch);
 }
@@ -165,15 +167,61 @@ void ScriptPlayer::FreeAll()
         }
     }
     FreeIdPages();
+    jpegInfo = nullptr;
+    jpegInfoLen = 0;
     Rewind();
 }
 
-void ScriptPlayer::FreeCache()
+bool ScriptPlayer::HasRoomFor(U64 pixels) const
+{
+    return livePixels + pixels <= gLimits.movieBitmapPixels &&
+           allPixels + pixels <= gLimits.allBitmapPixels;
+}
+
+bool ScriptPlayer::CreatePixels(SCharacter* ch, int format, S32 width, S32 height,
+                                const SColorTable* ctab)
+{
+    const U64 pixels = U64(width) * U64(height);
+    if (pixels > gLimits.bitmapPixels)
+        return false;
+    if (!HasRoomFor(pixels))
+        DropUnusedPixels();
+    if (!HasRoomFor(pixels))
+        return false;
+    if (!ch->bitmap.PICreate(format, width, height, ctab, 1)) {
+        ch->bitmap.PIFree();
+        return false;
+    }
+    livePixels += pixels;
+    allPixels += pixels;
+    return true;
+}
+
+void ScriptPlayer::DropPixels(SCharacter* ch)
+{
+    const U64 pixels = ch->bitmap.PixelCount();
+    livePixels -= pixels;
+    allPixels -= pixels;
+    ch->bitmap.PIFree();
+}
+
+void ScriptPlayer::DropUnusedPixels()
 {
     for (SCharacter* ch : charIndex) {
         for (; ch; ch = ch->next) {
             if (ch->type == kCharBitmap && ch->bitmap.useCount == 0)
-                ch->bitmap.PIFree();
+                DropPixels(ch);
+        }
+    }
+}
+
+void ScriptPlayer::FreeCache()
+{
+    DropUnusedPixels();
+    for (SCharacter* ch : charIndex) {
+        for (; ch; ch = ch->next) {
+            if (ch->type == kCharBitmap)
+                ch->bitmap.buildFailed = 0;
         }
     }
     charAlloc.FreeEmpties();

@@ -39,7 +39,8 @@ public:
     S32 frameRate = 0;                // frames a second, 16.16
     S32 frameDelay = 0;               // milliseconds
     U32 version = 0;
-    void* jpegInfo = nullptr;     // the shared JPEG decoder, when one has been set up
+    const U8* jpegInfo = nullptr; // body of the tag with the shared JPEG tables; null: none yet
+    S32 jpegInfoLen = 0;
     StreamData* stream = nullptr; // the stream that feeds this movie
     bool varsMode = false;        // the stream carries variables, not a movie
     S32 varsLayer = -1;           // level that receives them
@@ -63,8 +64,16 @@ public:
     // run again. Objects elsewhere that show characters of this movie (clones of its sprites, for
     // example) stay where they are, but empty; see DisplayList::ForgetMovie.
     void FreeAll();
-    // Drops decoded pixels that nobody uses, and empty pool blocks.
+    // Drops decoded pixels that nobody uses, and empty pool blocks; images that could not be
+    // decoded are tried again when they are next wanted.
     void FreeCache();
+
+    // Creates the pixels of a bitmap of this movie, all zero, for whoever decodes it; see
+    // SBitmapCore::PICreate. False, and no pixels, when they fail or the movie's budget does not
+    // allow them even without the pixels that nobody uses.
+    bool CreatePixels(SCharacter* ch, int format, S32 width, S32 height, const SColorTable* ctab);
+    // Frees a bitmap's pixels, if there are any.
+    void DropPixels(SCharacter* ch);
 
     // A zeroed entry of type kCharNone, or null when the id is taken or memory is exhausted.
     SCharacter* CreateCharacter(U16 id);
@@ -104,6 +113,8 @@ private:
     bool IndexCharacter(U16 id, SCharacter* ch);
     void FreeIdPages();
     void DestroyCharacter(SCharacter* ch);
+    bool HasRoomFor(U64 pixels) const;
+    void DropUnusedPixels();
     void RemoveRootObject();
 
     // By the high byte of the id, then by the low one: a chain may grow to 512 records, too many to
@@ -111,6 +122,7 @@ private:
     SCharacter** idPages[kIdPages] = {};
     GrowBuffer<U8> varsData; // bytes of a variables stream
     U32 characterCount = 0;  // records of the pool in use
+    U64 livePixels = 0;      // of the bitmaps that have some
 };
 
 // A user of a character's record: a pointer that must stay valid.

@@ -86,6 +86,11 @@ public:
     // Removes the sprite's object; with `keep` an empty sprite takes its place, transform and name.
     void RemoveSprite(ScriptThread* sprite, bool keep);
 
+    // Makes sure that the pixels of a bitmap exist, decoding its tag in the movie that owns it; false
+    // when there are none: no bitmap, no image in the tag, no room for it. That is remembered until
+    // the movie's FreeCache.
+    static bool BuildBits(SCharacter* ch);
+
     // Back to a timeline without data that has not started.
     void ClearState();
     // The movie is going, but not this timeline of it: it stands still for good, without data.
@@ -126,6 +131,7 @@ private:
     void DefineShape();
     void DefineMorphShape();
     void DefineBits();
+    void DefineJPEGTables();
     void DefineButton();
     void DefineFont();
     void DefineFont2();
