@@ -100,7 +100,7 @@ void DisplayList::PaintFocus(RColor* color, REdge** edges)
     MatrixIdentity(&identity);
     SetUpSolid(color, &raster, {255, 255, 0, 255});
     for (const SRECT& bar : bars)
-        AddRect(&bar, &identity, color, this, edges);
+        AddRect(&bar, &identity, color, this, edges, nullptr);
     // The bars share their corners, where even-odd crossings would leave holes.
     for (REdge* e = *edges; e; e = e->next)
         e->fillRule = kRuleWinding;

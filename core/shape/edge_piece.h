@@ -1,4 +1,4 @@
-// The last step before the raster: a monotonic curve becomes an edge, or is found not to fit one.
+// The last step before the raster: device-space curves are cut into pieces that an edge can hold.
 #pragma once
 
 #include "core/geom/curve.h"
@@ -34,3 +34,32 @@ EPieceFate GuardPiece(CURVE* c, bool mayHalve);
 // Makes an edge of a y-monotonic piece that fits and pushes it on `list`; fill rule and colours
 // are left to the caller. Null when the pool is exhausted. The piece must not be level.
 REdge* PushEdge(DisplayList* display, REdge** list, const CURVE& c);
+
+// Cuts every curve into pieces that are monotonic in y, short enough for the scanline stepper and
+// inside the 16 bits of an edge, and pushes them on one edge list with a rule and two colours that
+// the caller sets. Once the edge pool is exhausted nothing is cut any more.
+class CEdgeCutter {
+public:
+    bool hugeCoords = false;  // what is cut reaches beyond what an edge can hold
+    U8 fillRule = 0;          // of the edges being added
+    RColor* color1 = nullptr; // of the edges being added
+    RColor* color2 = nullptr;
+    S32 depth = 0; // of curve splitting
+
+    CEdgeCutter(DisplayList* display, REdge** list) : edgeDisplay(display), edgeList(list) {}
+
+    // Adds one curve, in its direction.
+    void AddCurve(const CURVE* c);
+
+protected:
+    bool edgesLost = false; // the edge pool is exhausted
+
+private:
+    void SplitAtTurn(const CURVE& c);
+    void SplitAtMiddle(const CURVE& c);
+    void AddHalves(const CURVE& first, const CURVE& second);
+    void AddPiece(CURVE* c);
+
+    DisplayList* edgeDisplay; // owner of the edge pool
+    REdge** edgeList;
+};
