@@ -41,7 +41,8 @@ class SPlayer : public ScriptPlayer {
 public:
     DisplayList scene;              // the display list; `display` of every thread points here
     ScriptPlayer* layers = nullptr; // levels 1 and up, through nextLayer, newest first
-    CBitBuffer bits;                // the screen bitmap
+    CBitBuffer bits;                // the screen bitmap ...
+    CScreenFormat screenFormat;     // ... and how it is made; see SetScreenFormat
     int highQuality = 1;            // anti-aliased drawing
     int autoQuality = 0;            // DoPlay may switch the quality by measured speed
     int qualityHold = 1000;         // ticks since the last automatic switch
@@ -121,6 +122,8 @@ public:
     void OnDraw();
     // Frees the screen bitmap, which the next paint makes anew.
     void FreeBuffer();
+    // The same with other pixels from then on. A palette must live until the next call.
+    void SetScreenFormat(const CScreenFormat& format);
 
     // --- view ---
     void GotoFrame(S32 frame);

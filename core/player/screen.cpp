@@ -24,7 +24,7 @@ bool SPlayer::CreateBits(const SRECT* client)
     if (width > CBitBuffer::kMaxSide || height > CBitBuffer::kMaxSide ||
         width * height > gLimits.surfacePixels)
         return false;
-    if (!bits.CreateScreenBits(static_cast<S32>(width), static_cast<S32>(height)))
+    if (!bits.CreateScreenBits(static_cast<S32>(width), static_cast<S32>(height), screenFormat))
         return false;
     ChooseCamera();
     scene.ModifyCamera();
@@ -100,4 +100,10 @@ void SPlayer::FreeBuffer()
 {
     bits.FreeBits();
     scene.InvalidateRect(&scene.devViewRect);
+}
+
+void SPlayer::SetScreenFormat(const CScreenFormat& format)
+{
+    screenFormat = format;
+    FreeBuffer();
 }

@@ -5,6 +5,7 @@
 #include <cstring>
 
 #include "core/player/limits.h"
+#include "core/raster/palette.h"
 
 static U32 Pack32(const CRow&, const RGBI& c)
 {
@@ -47,17 +48,22 @@ static void RampRow32(const CRow& row, S32 x, const U32* ramp, const U16* index,
         dst[i] = ramp[index[i]];
 }
 
-static const CPixelOps kOps32 = {32,        Pack32,    ReadRow32, WriteRow32,
-                                 FillRow32, CopyRow32, RampRow32};
+static const CPixelOps kOps32 = {32,         false,     Pack32,    ReadRow32,
+                                 WriteRow32, FillRow32, CopyRow32, RampRow32};
 
-const CPixelOps* PixelOps(CPixelFormat)
+const CPixelOps* PixelOps(CPixelFormat format, bool dither)
 {
-    return &kOps32;
+    static constexpr const CPixelOps* kTables[][2] = {{&kOps32, &kOps32},
+                                                      {&kOps16, &kOps16Diffused},
+                                                      {&kOps15, &kOps15Diffused},
+                                                      {&kOps8, &kOps8Dithered}};
+    return kTables[U32(format) <= kPixel8 ? format : kPixel32][dither];
 }
 
 CBitBuffer::~CBitBuffer()
 {
     FreeBits();
+    std::free(palette);
 }
 
 bool CBitBuffer::CreateScreenBits(S32 w, S32 h, CPixelFormat pixelFormat, bool rowsBottomUp)
@@ -76,6 +82,23 @@ bool CBitBuffer::CreateScreenBits(S32 w, S32 h, CPixelFormat pixelFormat, bool r
     format = pixelFormat;
     bottomUp = rowsBottomUp;
     return true;
+}
+
+bool CBitBuffer::CreateScreenBits(S32 w, S32 h, const CScreenFormat& screen)
+{
+    dither = screen.dither;
+    if (screen.pixels == kPixel8 && !SetPalette(screen.palette, screen.transparentIndex))
+        return false;
+    return CreateScreenBits(w, h, screen.pixels, screen.bottomUp);
+}
+
+bool CBitBuffer::SetPalette(const SColorTable* table, S32 transparentIndex)
+{
+    if (!palette)
+        palette = static_cast<CPalette*>(std::malloc(sizeof(CPalette)));
+    if (palette)
+        palette->Build(table, transparentIndex);
+    return palette != nullptr;
 }
 
 void CBitBuffer::FreeBits()

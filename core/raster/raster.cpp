@@ -20,6 +20,8 @@ void CRaster::Attach(CBitBuffer* to, const SRECT* r, int aa)
 {
     output = to;
     ops = to ? to->Ops() : PixelOps(kPixel32);
+    outRow = CRow();
+    outRow.palette = to ? to->Palette() : nullptr;
     antialias = aa;
     alphaOutput = false;
     area = {};
@@ -33,6 +35,21 @@ void CRaster::Attach(CBitBuffer* to, const SRECT* r, int aa)
     }
     S32 scale = aa ? 4 : 1;
     areaDev = {area.xmin * scale, area.xmax * scale, area.ymin * scale, area.ymax * scale};
+    PrepareErrors();
+}
+
+// Without memory nothing diffuses.
+void CRaster::PrepareErrors()
+{
+    errorRows.Clear();
+    if (ops->diffuses && BitsValid())
+        errorRows.Resize(2 * ErrorRowLength());
+}
+
+// A column more on both sides.
+size_t CRaster::ErrorRowLength() const
+{
+    return 3 * size_t(output->Width() + 2);
 }
 
 void CRaster::SetBackgroundBits(CBitBuffer* background)
@@ -95,6 +112,10 @@ void CRaster::AddEdges(REdge* edges, RColor* colors, RColor* clip)
         c->nextActive = nullptr;
         c->pixValid = 0;
         c->spanRow = 0;
+        // Only now the output is sure: the colour may have been built for a hit test, or for
+        // pixels of another format or palette.
+        if (c->colorType == kColorSolid)
+            c->rgbPixel = ops->pack(outRow, c->rgb);
     }
     layer += 0x10000;
     layersFull = layer == 0;
@@ -104,16 +125,23 @@ void CRaster::SetYCoord(S32 y0)
 {
     rowY = y0;
     outRow = output->Row(y0);
+    if (errorRows.size() == 0)
+        return;
+    S16* first = errorRows.data() + 3;
+    S16* second = first + ErrorRowLength();
+    oddErrors = !oddErrors;
+    outRow.errors = oddErrors ? second : first;
+    outRow.nextErrors = oddErrors ? first : second;
+    std::fill_n(outRow.nextErrors - 3, ErrorRowLength(), S16(0));
 }
 
 void CRaster::FillBackground(SRGB color)
 {
     RGBI value = {color.blue, color.green, color.red, color.alpha};
     Premultiply(&value);
-    for (S32 y0 = area.ymin; y0 < area.ymax; ++y0) {
-        const CRow at = output->Row(y0);
-        ops->fillRow(at, area.xmin, ops->pack(at, value), area.xmax - area.xmin);
-    }
+    U32 packed = ops->pack(outRow, value);
+    for (S32 y0 = area.ymin; y0 < area.ymax; ++y0)
+        ops->fillRow(output->Row(y0), area.xmin, packed, area.xmax - area.xmin);
 }
 
 void CRaster::PaintBits()
@@ -145,6 +173,7 @@ void CRaster::Flush() {}
 
 void CRaster::FreeEmpties()
 {
+    errorRows.Release();
     activeAlloc.FreeEmpties();
     rampAlloc.FreeEmpties();
     stacks.Release();

@@ -98,7 +98,8 @@ public:
     // Fills the area with a colour at once, under everything that is painted later.
     void FillBackground(SRGB color);
 
-    // Makes pixel row y the current one.
+    // Makes pixel row y the current one. With error diffusion it takes over what the row made
+    // current before it left for it.
     void SetYCoord(S32 y);
 
     // Returns empty blocks of the pools, and what a crowded row took, to the system.
@@ -122,6 +123,9 @@ private:
     static constexpr int kMaxCollected = 255; // colours that one span can blend
     // Stacks of one pixel row; a row with more stays unpainted.
     static constexpr size_t kMaxStacks = 1u << 19;
+
+    void PrepareErrors();
+    size_t ErrorRowLength() const;
 
     // active.cpp: edges entering, moving and leaving
     void AddActive();
@@ -190,6 +194,8 @@ private:
     CBitBuffer* backgroundBits = nullptr;
     const CPixelOps* ops;
     CRow outRow; // the current one
+    GrowBuffer<S16> errorRows; // two of CRow::errors, in turns; empty: the output diffuses nothing
+    bool oddErrors = false;    // the second one is the current row's
     S32 rowY = 0; // current pixel row
     int antialias = 0;
     bool alphaOutput = false;

@@ -80,7 +80,6 @@ void RColor::BuildCache()
         skipped = !BuildGradientCache(this);
         transparent = transparent || skipped;
     } else if (colorType == kColorSolid) {
-        rgbPixel = raster->Ops()->pack(raster->Row(), rgb);
         drawSlabProc = DrawSolidSlab;
         buildSlabProc = transparent ? CompositeSolidSlab : BuildSolidSlab;
     }

@@ -45,7 +45,7 @@ struct RColor {
     RBuildSlabProc buildSlabProc; // fills a buffer (opaque), or blends over it (transparent)
 
     RGBI rgb;     // the solid value, premultiplied
-    U32 rgbPixel; // the same as a pixel of the output format
+    U32 rgbPixel; // the same packed for the output, set when the colour joins a paint
 
     U32 pixKey;      // y << 16 | (x & 0xFFFF) of the last pixel computed singly for anti-aliasing
     U8 pixValid;     // pixKey and pixValue hold something

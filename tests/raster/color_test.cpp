@@ -72,29 +72,6 @@ TEST(Color, LanesKeepTheirChannels)
                   0x00FFFFFFu);
 }
 
-// A gradient over the whole buffer: `inv` maps pixels << 8 to the gradient square << 8.
-struct GradientScene : RasterScene {
-    RColor* c;
-    GradientScene(S32 w, S32 h, int aa, U8 type, const MATRIX& inv,
-                  std::initializer_list<U8> ratios, std::initializer_list<SRGB> stops)
-        : RasterScene(w, h, aa), c(New())
-    {
-        c->colorType = kColorGradient;
-        c->gradientType = type;
-        c->gradientInv = inv;
-        std::copy(ratios.begin(), ratios.end(), c->ramp.ratios);
-        std::copy(stops.begin(), stops.end(), c->ramp.colors);
-        c->ramp.count = U8(ratios.size());
-        for (const SRGB& s : stops)
-            c->transparent |= s.alpha < 255;
-        c->BuildCache();
-        S32 k = aa ? 4 : 1;
-        Box(NewObject(), {0, w * k, 0, h * k}, c);
-    }
-};
-
-constexpr SRGB kBlack = {0, 0, 0, 255}, kWhite = {255, 255, 255, 255};
-
 TEST(Gradient, RampFollowsItsStops)
 {
     MATRIX inv = {0x10000, 0, 0, 0x10000, 0, 0};

@@ -112,11 +112,15 @@ public:
     }
     void Paint(bool alpha = false) { Paint({0, bits.Width(), 0, bits.Height()}, alpha); }
     U32 At(S32 x, S32 y) const { return bits.Row32(y)[x]; }
-    std::vector<U32> Pixels() const
+    // Words, whatever the format.
+    std::vector<U32> Pixels()
     {
         std::vector<U32> all;
-        for (S32 y = 0; y < bits.Height(); ++y)
-            all.insert(all.end(), bits.Row32(y), bits.Row32(y) + bits.Width());
+        RGBI c;
+        for (S32 i = 0, w = bits.Width(); i < w * bits.Height(); ++i) {
+            bits.Ops()->readRow(bits.Row(i / w), i % w, &c, 1);
+            all.push_back(PackLanes(ToLanes(c)));
+        }
         return all;
     }
 
@@ -141,3 +145,26 @@ private:
 
     std::deque<RColor> colors;
 };
+
+// A gradient over the whole buffer: `inv` maps pixels << 8 to the gradient square << 8.
+struct GradientScene : RasterScene {
+    RColor* c;
+    GradientScene(S32 w, S32 h, int aa, U8 type, const MATRIX& inv,
+                  std::initializer_list<U8> ratios, std::initializer_list<SRGB> stops)
+        : RasterScene(w, h, aa), c(New())
+    {
+        c->colorType = kColorGradient;
+        c->gradientType = type;
+        c->gradientInv = inv;
+        std::copy(ratios.begin(), ratios.end(), c->ramp.ratios);
+        std::copy(stops.begin(), stops.end(), c->ramp.colors);
+        c->ramp.count = U8(ratios.size());
+        for (const SRGB& s : stops)
+            c->transparent |= s.alpha < 255;
+        c->BuildCache();
+        S32 k = aa ? 4 : 1;
+        Box(NewObject(), {0, w * k, 0, h * k}, c);
+    }
+};
+
+constexpr SRGB kBlack = {0, 0, 0, 255}, kWhite = {255, 255, 255, 255};
