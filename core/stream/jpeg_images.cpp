@@ -7,7 +7,7 @@
 #include "core/stream/script_player.h"
 
 namespace {
-constexpr U32 kMaxScans = 100;
+constexpr int kMaxScans = 100;
 constexpr int kMaxStreams = 16; // table streams before the image
 
 // One image being decoded. On the stack of ReadJPEGImage, out of reach of the guard's jump.
@@ -18,7 +18,9 @@ struct JpegDecoder {
     SByteBlock tables;
     SByteBlock image;
     SCharacter* ch;
-    S32 rows; // decoded so far
+    S32 rows;     // decoded so far
+    int scans;    // taken in so far, of an image in several
+    int maxScans; // that are wanted
 };
 
 // The whole block is in the buffer from the start. Behind it comes an end-of-image marker, as often
@@ -99,10 +101,11 @@ void AbsorbScans(JpegDecoder* d)
     jpeg_decompress_struct* info = &d->info;
     const U64 pixels = U64(info->image_width) * info->image_height;
     const U64 worth = std::clamp<U64>(gLimits.jpegScanPixels / pixels, 1, kMaxScans);
-    const int scans = static_cast<int>(worth);
-    while (!jpeg_input_complete(info) && info->input_scan_number <= scans)
-        jpeg_consume_input(info);
-    jpeg_start_output(info, std::min(info->input_scan_number, scans));
+    const int wanted = std::min(d->maxScans, static_cast<int>(worth));
+    d->scans = 0;
+    while (d->scans < wanted && !jpeg_input_complete(info))
+        d->scans += jpeg_consume_input(info) == JPEG_SCAN_COMPLETED;
+    jpeg_start_output(info, d->scans);
 }
 
 // Reads each pixel as four bytes, one more than it has: the line is that much longer.
@@ -145,7 +148,7 @@ void Decode(void* decoder)
         return;
     const auto width = static_cast<S32>(info->image_width);
     const auto height = static_cast<S32>(info->image_height);
-    if (!d->ch->player->CreatePixels(d->ch, 5, width, height, nullptr))
+    if (!d->ch->bitmap.baseAddr && !d->ch->player->CreatePixels(d->ch, 5, width, height, nullptr))
         return;
     SetParameters(info);
     jpeg_start_decompress(info);
@@ -153,21 +156,33 @@ void Decode(void* decoder)
         AbsorbScans(d);
     ReadLines(d);
 }
-} // namespace
 
 // Broken tables leave those that were read before the break. An aborted decoder keeps its tables.
+void Run(JpegDecoder* d)
+{
+    d->info = {};
+    d->info.err = JpegGuardInit(&d->guard);
+    if (JpegGuardRun(&d->guard, Create, d)) {
+        JpegGuardRun(&d->guard, ReadTables, d);
+        jpeg_abort_decompress(&d->info);
+        JpegGuardRun(&d->guard, Decode, d);
+    }
+    jpeg_destroy_decompress(&d->info);
+}
+} // namespace
+
 S32 ReadJPEGImage(SByteBlock tables, SByteBlock image, SCharacter* ch)
 {
     JpegDecoder d = {};
     d.tables = tables;
     d.image = image;
     d.ch = ch;
-    d.info.err = JpegGuardInit(&d.guard);
-    if (JpegGuardRun(&d.guard, Create, &d)) {
-        JpegGuardRun(&d.guard, ReadTables, &d);
-        jpeg_abort_decompress(&d.info);
-        JpegGuardRun(&d.guard, Decode, &d);
+    d.maxScans = kMaxScans;
+    Run(&d);
+    // A break between two scans: those before it are whole, and make a coarser picture.
+    if (d.rows == 0 && d.scans > 0) {
+        d.maxScans = d.scans;
+        Run(&d);
     }
-    jpeg_destroy_decompress(&d.info);
     return d.rows;
 }
