@@ -27,10 +27,9 @@ TEST(PixelFormat, StoresWhatTheBitsAllow)
 }
 
 // The formats in order, each plain and then dithered.
-CScreenFormat Screen(int i, bool bottomUp)
-{
+constexpr auto Screen = [](int i, bool bottomUp) -> CScreenFormat {
     return {CPixelFormat(1 + i / 2), bottomUp, i % 2 == 1};
-}
+};
 
 // Runs end at odd places, so that a colour reaches its pixels in every way there is. What a row
 // hands down when errors diffuse begins with the area.
@@ -81,6 +80,7 @@ TEST(PixelFormat, PaletteColoursAreFlatAndAnyTableWillDo)
         const RGBI c = FromLanes(UnpackLanes(table.colors[i] | 0xFF000000));
         EXPECT_EQ(i < 200 && i != 7, s.bits.Ops()->pack(s.bits.Row(0), c) == i * 0x01010101) << i;
     }
+    EXPECT_EQ(nullptr, std::memchr(s.bits.Palette()->inverse, 7, CPalette::kCells));
     table.count = 1;
     for (S32 none : {-1, 0, 300})
         for (SColorTable* t : {&table, (SColorTable*)nullptr}) {
