@@ -1,61 +1,10 @@
-// Runs the built program, each test in a folder of its own.
-#include "tests/player/player_scene.h"
+// What the program says, lists, renders and refuses.
+#include "tests/tools/tool.h"
 
-#include <filesystem>
-#include <fstream>
 #include <random>
 #include <set>
-#include <sys/wait.h>
 
 namespace {
-
-struct Outcome {
-    int code = -1; // exit code; -1 when a signal ended it
-    std::string out, err;
-};
-
-// Movies and what the program says lie above its folder, so that the folder holds its files alone.
-class Tool : public testing::Test {
-protected:
-    Tool() : folder(std::string(mkdtemp(above)) + "/here/")
-    {
-        std::filesystem::create_directory(folder);
-    }
-    ~Tool() override { std::filesystem::remove_all(above); }
-
-    // Runs a line of shell in the folder with $vexel set; vexel with these words, quoted for it.
-    Outcome Shell(const std::string& line) const
-    {
-        const std::string script = "cd " + folder +
-                                   "; export LC_ALL=C vexel=" VEXEL_TOOL_PATH "; { " + line +
-                                   "\n} >../out 2>../err </dev/null";
-        const int status = std::system(script.c_str());
-        return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, Read("../out"), Read("../err")};
-    }
-    Outcome Run(const std::string& words) const { return Shell("$vexel " + words); }
-
-    void Write(const std::string& name, const std::vector<U8>& bytes) const
-    {
-        std::ofstream file(folder + name, std::ios::binary);
-        file.write(reinterpret_cast<const char*>(bytes.data()), std::streamsize(bytes.size()));
-    }
-    std::string Read(const std::string& name) const
-    {
-        std::ifstream file(folder + name, std::ios::binary);
-        return {std::istreambuf_iterator<char>(file), {}};
-    }
-    Picture Load(const std::string& name) const
-    {
-        Picture picture;
-        EXPECT_TRUE(LoadPng(folder + name, &picture)) << name;
-        return picture;
-    }
-    // The names in the folder, sorted, a blank between two.
-    std::string Files() const { return Shell("printf %s \"$(ls | xargs)\"").out; }
-
-    char above[32] = "/tmp/vexel-test-XXXXXX";
-    std::string folder;
-};
 
 TEST_F(Tool, SaysOneLineAboutAnError)
 {
@@ -77,7 +26,7 @@ TEST_F(Tool, SaysOneLineAboutAnError)
         {"$vexel render ../m -o", 2, "-o needs a value"},
         {"$vexel render ../m -o x.png --allow-net", 2, "unknown option --allow-net"},
         {"$vexel render ../m -o x.png --progress=yes", 2, "--progress takes no value"},
-        {"$vexel render ../m -o x.GIF", 2, ".gif output is not supported yet"},
+        {"$vexel render ../m -o x.BMP", 2, "no format goes by the extension .bmp: png, gif"},
         {"$vexel render ../m -o a.png/x", 2, "without extension"},
         {"$vexel render ../m -o %d%d.png", 2, "one number"},
         {"$vexel render ../m -o x.png --frames 1-2", 2, "several pictures"},
@@ -85,6 +34,12 @@ TEST_F(Tool, SaysOneLineAboutAnError)
         {"$vexel render ../m -o x.png --frame 1x", 2, "--frame N"},
         {"$vexel render ../m -o x.png --frame 99999999999", 2, "--frame N"},
         {"$vexel render ../m -o x.png --frame 1 --frames 1-1", 2, "--frame N"},
+        {"$vexel render ../m -o x.gif --frame 1 --duration 1", 2, "--duration S"},
+        {"$vexel render ../m -o x.gif --duration 0.0", 2, "--duration S"},
+        {"$vexel render ../m -o x.png --duration 1", 2, "several pictures"},
+        {"$vexel render ../m -o x%d.gif", 2, "takes no number"},
+        {"$vexel render ../m -o - --format bmp", 2, "--format takes one of png, gif"},
+        {"$vexel render ../m -o x.y4m --background transparent", 2, "cannot be transparent"},
         {"$vexel render ../m -o x%d.png --frames 3-2", 2, "--frames A-B"},
         {"$vexel render ../m -o x.png --size 0x5", 2, "--size"},
         {"$vexel render ../m -o x.png --size 8193x5", 2, "--size"},

@@ -1,6 +1,7 @@
 #include "tools/vexel/output_file.h"
 
 #include "tools/vexel/message.h"
+#include "tools/vexel/tidy_up.h"
 
 #include <cerrno>
 #include <cstdio>
@@ -25,6 +26,16 @@ size_t NumberMark(const std::string& text, size_t i, int* digits)
     return end < text.size() && text[end] == 'd' ? end + 1 - i : 0;
 }
 
+std::string FollowLinks(const std::string& path)
+{
+    char* resolved = realpath(path.c_str(), nullptr);
+    const std::string target = resolved != nullptr ? resolved : path;
+    std::free(resolved);
+    return target;
+}
+
+} // namespace
+
 bool WriteAll(int fd, std::span<const U8> bytes)
 {
     while (!bytes.empty()) {
@@ -37,48 +48,6 @@ bool WriteAll(int fd, std::span<const U8> bytes)
     }
     return true;
 }
-
-// Closing can report what writing did not, so its result counts.
-bool WriteAndClose(int fd, std::span<const U8> bytes)
-{
-    const bool written = WriteAll(fd, bytes);
-    const int why = errno;
-    const bool closed = close(fd) == 0;
-    if (!written)
-        errno = why;
-    return written && closed;
-}
-
-bool WriteInPlace(const std::string& path, std::span<const U8> bytes)
-{
-    const int fd = open(path.c_str(), O_WRONLY | O_CLOEXEC);
-    return fd >= 0 && WriteAndClose(fd, bytes);
-}
-
-bool WriteBeside(const std::string& path, std::span<const U8> bytes)
-{
-    const std::string temporary = path + Format(".%d.part", static_cast<int>(getpid()));
-    const int fd = open(temporary.c_str(), O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC, 0666);
-    if (fd < 0)
-        return false;
-    if (WriteAndClose(fd, bytes) && std::rename(temporary.c_str(), path.c_str()) == 0)
-        return true;
-    const int why = errno;
-    unlink(temporary.c_str());
-    errno = why;
-    return false;
-}
-
-// A link is followed, so that it is the file that gets replaced and not the link.
-std::string FollowLinks(const std::string& path)
-{
-    char* resolved = realpath(path.c_str(), nullptr);
-    const std::string target = resolved != nullptr ? resolved : path;
-    std::free(resolved);
-    return target;
-}
-
-} // namespace
 
 bool OutputName::Parse(const std::string& text)
 {
@@ -118,19 +87,102 @@ std::string OutputName::Extension() const
     return extension;
 }
 
-bool WriteWhole(const std::string& path, std::span<const U8> bytes, std::string* error)
+OutputPlace::OutputPlace(const std::string& name) : path(name), part(name)
 {
     struct stat info = {};
-    bool written;
-    if (path == "-")
-        written = WriteAll(STDOUT_FILENO, bytes);
-    else if (stat(path.c_str(), &info) != 0)
-        written = WriteBeside(path, bytes);
-    else if (S_ISREG(info.st_mode))
-        written = WriteBeside(FollowLinks(path), bytes);
-    else
-        written = WriteInPlace(path, bytes);
+    const bool there = stat(name.c_str(), &info) == 0;
+    if (there && !S_ISREG(info.st_mode))
+        return;
+    if (there)
+        path = FollowLinks(name);
+    part = path + Format(".%d.part", static_cast<int>(getpid()));
+    SetDoomedFile(part);
+}
+
+bool OutputPlace::Keep() const
+{
+    const bool kept = !Beside() || std::rename(part.c_str(), path.c_str()) == 0;
+    if (!kept)
+        Drop();
+    SetDoomedFile("");
+    return kept;
+}
+
+void OutputPlace::Drop() const
+{
+    const int why = errno;
+    if (Beside())
+        unlink(part.c_str());
+    SetDoomedFile("");
+    errno = why;
+}
+
+OutputFile::~OutputFile()
+{
+    if (fd < 0)
+        return;
+    Close();
+    place.Drop();
+}
+
+bool OutputFile::Fail()
+{
+    error = Format("cannot write: %s", std::strerror(errno));
+    return false;
+}
+
+// Standard output stays open.
+bool OutputFile::Close()
+{
+    const int closing = fd;
+    fd = -1;
+    return closing == STDOUT_FILENO || close(closing) == 0;
+}
+
+bool OutputFile::Open(const std::string& path)
+{
+    if (path == "-") {
+        fd = STDOUT_FILENO;
+        return true;
+    }
+    place = OutputPlace(path);
+    const int making = place.Beside() ? O_CREAT | O_TRUNC : 0;
+    fd = open(place.part.c_str(), O_WRONLY | O_CLOEXEC | making, 0666);
+    if (fd < 0)
+        place.Drop();
+    return fd >= 0 || Fail();
+}
+
+bool OutputFile::Write(std::span<const U8> bytes)
+{
+    constexpr size_t kEnough = 64 * 1024;
+    waiting.insert(waiting.end(), bytes.begin(), bytes.end());
+    return waiting.size() < kEnough || Flush();
+}
+
+bool OutputFile::Flush()
+{
+    const bool written = WriteAll(fd, waiting);
+    waiting.clear();
+    return written || Fail();
+}
+
+// Closing can report what writing did not, so its result counts.
+bool OutputFile::Commit()
+{
+    if (!Flush())
+        return false;
+    if (Close())
+        return place.Keep() || Fail();
+    place.Drop();
+    return Fail();
+}
+
+bool WriteWhole(const std::string& path, std::span<const U8> bytes, std::string* error)
+{
+    OutputFile file;
+    const bool written = file.Open(path) && file.Write(bytes) && file.Commit();
     if (!written)
-        *error = Format("cannot write: %s", std::strerror(errno));
+        *error = file.error;
     return written;
 }

@@ -5,6 +5,7 @@
 
 #include <span>
 #include <string>
+#include <vector>
 
 // A name that may hold one %d or %0Nd for the number of a picture; %% stands for a percent sign.
 class OutputName {
@@ -25,7 +26,52 @@ private:
     bool numbered = false;
 };
 
-// Writes all bytes to the file, or to standard output for "-". A regular file is written under
-// another name first and then takes the place of the old one; a device or pipe is written to as it
-// is. On failure nothing is left behind and false is returned with `error` set.
+// Everything to a descriptor, however many calls it takes. On failure errno says why.
+bool WriteAll(int fd, std::span<const U8> bytes);
+
+// The place of an output file. A regular file is made under another name, PATH.PID.part, and takes
+// its place when it is all there; a device or pipe is written to as it is.
+struct OutputPlace {
+    std::string path; // what is to be replaced; links are followed, so that they stay links
+    std::string part; // where the bytes go: `path` itself for what is written to as it is
+
+    // Without a place; "-" is no path here.
+    OutputPlace() = default;
+    explicit OutputPlace(const std::string& name);
+
+    bool Beside() const { return part != path; }
+    // Puts the part in its place. On failure it is gone, and errno says why.
+    bool Keep() const;
+    // Removes the part.
+    void Drop() const;
+};
+
+// Bytes on their way into a file or, for "-", to standard output. False means failure with `error`
+// set. What has not been committed when the object ends is removed.
+class OutputFile {
+public:
+    OutputFile() = default;
+    ~OutputFile();
+    OutputFile(const OutputFile&) = delete;
+    OutputFile& operator=(const OutputFile&) = delete;
+
+    bool Open(const std::string& path);
+    bool Write(std::span<const U8> bytes);
+    // Lets the other end of a pipe have all that was written.
+    bool Flush();
+    // Nothing follows; the file takes its place.
+    bool Commit();
+
+    std::string error;
+
+private:
+    bool Fail();
+    bool Close();
+
+    OutputPlace place;
+    int fd = -1;
+    std::vector<U8> waiting; // not yet handed to the system
+};
+
+// The whole of a file at once. False with `error` set.
 bool WriteWhole(const std::string& path, std::span<const U8> bytes, std::string* error);

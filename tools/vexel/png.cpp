@@ -1,5 +1,7 @@
 #include "tools/vexel/png.h"
 
+#include "tools/vexel/pixel_bytes.h"
+
 #include <png.h>
 
 namespace {
@@ -31,43 +33,10 @@ void Nothing(png_structp) {}
 
 void Ignore(png_structp, png_const_charp) {}
 
-U8* PutOpaque(U8* to, U32 pixel)
-{
-    to[0] = static_cast<U8>(pixel >> 16);
-    to[1] = static_cast<U8>(pixel >> 8);
-    to[2] = static_cast<U8>(pixel);
-    return to + 3;
-}
-
-U8 Divide(U32 channel, U32 alpha)
-{
-    const U32 value = (channel * 255 + alpha / 2) / alpha;
-    return static_cast<U8>(value > 255 ? 255 : value);
-}
-
-U8* PutTransparent(U8* to, U32 pixel)
-{
-    const U32 alpha = pixel >> 24;
-    if (alpha == 255) {
-        PutOpaque(to, pixel);
-    } else if (alpha == 0) {
-        std::memset(to, 0, 3);
-    } else {
-        to[0] = Divide(pixel >> 16 & 255, alpha);
-        to[1] = Divide(pixel >> 8 & 255, alpha);
-        to[2] = Divide(pixel & 255, alpha);
-    }
-    to[3] = static_cast<U8>(alpha);
-    return to + 4;
-}
-
 void WriteRows(Encoder* e, const CBitBuffer& picture, bool alpha)
 {
     for (S32 y = 0; y < picture.Height(); y++) {
-        const U32* from = picture.Row32(y);
-        U8* to = e->row.data();
-        for (S32 x = 0; x < picture.Width(); x++)
-            to = alpha ? PutTransparent(to, from[x]) : PutOpaque(to, from[x]);
+        (alpha ? PutRgba : PutRgb)(picture.Row32(y), picture.Width(), e->row.data());
         png_write_row(e->png, e->row.data());
     }
 }

@@ -1,14 +1,13 @@
 // `vexel render`: pictures of a movie, each written as soon as its data is there.
-#include "core/geom/grow_buffer.h"
 #include "platform/headless/native_player.h"
 #include "tools/vexel/commands.h"
 #include "tools/vexel/message.h"
 #include "tools/vexel/movie_input.h"
-#include "tools/vexel/png.h"
+#include "tools/vexel/progress.h"
 #include "tools/vexel/render_options.h"
 
-#include <cstdio>
-#include <unistd.h>
+#include <csignal>
+#include <new>
 
 namespace {
 
@@ -25,8 +24,9 @@ private:
     bool PassHolds(int picture);
     bool IsLast(int picture);
     int CheckArea();
+    int Begin();
     int WritePicture(int picture);
-    void ShowProgress(int picture);
+    int FailWriting();
     int Finish();
     int Missing(int picture);
 
@@ -35,12 +35,17 @@ private:
     NativePlayerWnd player;
     int failure = kExitDone; // of the input
     S32 framesOfWhole = -1;  // once all is there
-    GrowBuffer<U8> png;
+    std::unique_ptr<PictureSink> sink;
+    int last = 0; // picture, unless there is to be one pass
+    Progress progress;
     U8 block[64 * 1024];
 };
 
 Renderer::Renderer(const RenderOptions& renderOptions)
-    : options(renderOptions), player(renderOptions.width, renderOptions.height)
+    : options(renderOptions), player(renderOptions.width, renderOptions.height),
+      sink(renderOptions.format->make(renderOptions.output)),
+      progress(renderOptions.progress,
+               renderOptions.output.Numbered() || renderOptions.format->several)
 {
     player.SetQuality(options.quality);
     if (options.setBackground)
@@ -101,7 +106,7 @@ bool Renderer::PassHolds(int picture)
 
 bool Renderer::IsLast(int picture)
 {
-    return options.wholePass ? !PassHolds(picture + 1) : picture >= options.last;
+    return options.wholePass ? !PassHolds(picture + 1) : picture >= last;
 }
 
 int Renderer::CheckArea()
@@ -121,39 +126,46 @@ int Renderer::CheckArea()
     return kExitDone;
 }
 
+// With the first picture at hand: what the movie says of itself is known.
+int Renderer::Begin()
+{
+    const int code = CheckArea();
+    if (code != kExitDone)
+        return code;
+    last = options.LastFor(player.frameDelay);
+    const PictureForm form = {player.Width(), player.Height(), player.frameDelay,
+                              options.Transparent()};
+    return sink->Begin(form) ? kExitDone : FailWriting();
+}
+
+int Renderer::FailWriting()
+{
+    progress.End();
+    Complain(sink->fault.file, sink->fault.what);
+    return sink->fault.code;
+}
+
 int Renderer::WritePicture(int picture)
 {
     const CBitBuffer* pixels = player.Picture();
-    if (pixels == nullptr || !EncodePng(*pixels, options.Transparent(), &png)) {
+    if (pixels == nullptr) {
+        progress.End();
         Complain(input.Name(), Format("no memory for a picture of %dx%d pixels", player.Width(),
                                       player.Height()));
         return kExitLimit;
     }
-    const std::string path = options.output.For(picture);
-    std::string error;
-    if (!WriteWhole(path, {png.data(), png.size()}, &error)) {
-        Complain(path, error);
-        return kExitFailed;
-    }
+    if (!sink->Add(*pixels, picture))
+        return FailWriting();
+    progress.Show("picture", picture);
     return kExitDone;
-}
-
-// On a terminal one line that counts up, elsewhere a line a picture.
-void Renderer::ShowProgress(int picture)
-{
-    const bool terminal = isatty(STDERR_FILENO);
-    if (!options.progress && !terminal)
-        return;
-    if (!options.progress && !options.output.Numbered())
-        return;
-    std::fprintf(stderr, terminal ? "\rpicture %d" : "picture %d\n", picture);
-    if (terminal && IsLast(picture))
-        std::fputc('\n', stderr);
 }
 
 // Everything asked for is written; a file that is too short is worth a word all the same.
 int Renderer::Finish()
 {
+    if (!sink->Finish())
+        return FailWriting();
+    progress.End();
     if (input.Size() >= 0 && input.Size() < player.scriptLen)
         FeedAll();
     if (input.Ended() && !player.Complete())
@@ -163,6 +175,7 @@ int Renderer::Finish()
 
 int Renderer::Missing(int picture)
 {
+    progress.End();
     if (failure != kExitDone)
         return failure;
     if (!player.Complete())
@@ -179,12 +192,11 @@ int Renderer::Run()
     for (int picture = 1;; picture++) {
         if (!Reach(picture))
             return Missing(picture);
-        int code = picture == 1 ? CheckArea() : kExitDone;
-        if (code == kExitDone && (options.wholePass || picture >= options.first))
+        int code = picture == 1 ? Begin() : kExitDone;
+        if (code == kExitDone && picture >= options.first)
             code = WritePicture(picture);
         if (code != kExitDone)
             return code;
-        ShowProgress(picture);
         if (IsLast(picture))
             return Finish();
     }
@@ -197,6 +209,13 @@ int RenderCommand(std::span<char* const> words)
     RenderOptions options;
     if (!options.Parse(words))
         return kExitUsage;
-    Renderer renderer(options);
-    return renderer.Run();
+    // A reader of our output that goes away shows as a failed write.
+    std::signal(SIGPIPE, SIG_IGN);
+    try {
+        const auto renderer = std::make_unique<Renderer>(options);
+        return renderer->Run();
+    } catch (const std::bad_alloc&) {
+        Complain(options.movie, "no memory for its pictures");
+        return kExitLimit;
+    }
 }

@@ -7,7 +7,8 @@
 namespace {
 
 constexpr OptionForm kOptions[] = {
-    {"-o", true},        {"--frame", true},      {"--frames", true},    {"--size", true},
+    {"-o", true},        {"--format", true},     {"--frame", true},
+    {"--frames", true},  {"--duration", true},   {"--size", true},
     {"--quality", true}, {"--background", true}, {"--progress", false},
 };
 
@@ -21,12 +22,34 @@ bool ParsePair(const std::string& text, char mark, int high, int* a, int* b)
            ParseNumber(text.substr(at + 1), 1, high, b);
 }
 
+// Seconds with up to three decimals, as milliseconds.
+bool ParseSeconds(const std::string& text, int* milliseconds)
+{
+    constexpr int kMost = 24 * 60 * 60;
+    const size_t point = text.find('.');
+    const std::string whole = point == 0 ? "0" : text.substr(0, point);
+    std::string decimals = point == std::string::npos ? "0" : text.substr(point + 1);
+    int seconds = 0;
+    int rest = 0;
+    if (decimals.empty() || decimals.size() > 3)
+        return false;
+    decimals.resize(3, '0');
+    if (!ParseNumber(whole, 0, kMost, &seconds) ||
+        !ParseNumber(decimals, 0, 999, &rest))
+        return false;
+    *milliseconds = seconds * 1000 + rest;
+    return *milliseconds > 0;
+}
+
 bool ParseFrames(const Arguments& args, RenderOptions* options)
 {
     const std::string* frame = args.Find("--frame");
     const std::string* frames = args.Find("--frames");
-    if (frame != nullptr && frames != nullptr)
+    const std::string* duration = args.Find("--duration");
+    if ((frame != nullptr) + (frames != nullptr) + (duration != nullptr) > 1)
         return false;
+    if (duration != nullptr)
+        return ParseSeconds(*duration, &options->duration);
     if (frame != nullptr) {
         options->last = 0;
         const bool good = ParseNumber(*frame, 1, kLastPicture, &options->first);
@@ -36,7 +59,7 @@ bool ParseFrames(const Arguments& args, RenderOptions* options)
     if (frames != nullptr)
         return ParsePair(*frames, '-', kLastPicture, &options->first, &options->last) &&
                options->first <= options->last;
-    options->wholePass = options->output.Numbered();
+    options->wholePass = options->output.Numbered() || options->format->several;
     return true;
 }
 
@@ -84,7 +107,7 @@ bool ParseColor(const std::string& text, SRGB* color)
 std::string ParseValues(const Arguments& args, RenderOptions* options)
 {
     if (!ParseFrames(args, options))
-        return "pictures are chosen by --frame N or --frames A-B, counted from 1";
+        return "pictures are chosen by --frame N or --frames A-B, counted from 1, or --duration S";
     const std::string* size = args.Find("--size");
     if (size != nullptr &&
         !ParsePair(*size, 'x', CBitBuffer::kMaxSide, &options->width, &options->height))
@@ -100,15 +123,37 @@ std::string ParseValues(const Arguments& args, RenderOptions* options)
     return "";
 }
 
+// By the word for it, by the name's extension, or PNG on standard output.
+std::string ChooseFormat(const Arguments& args, RenderOptions* options)
+{
+    const OutputName& output = options->output;
+    const std::string extension = output.Extension();
+    const std::string* word = args.Find("--format");
+    if (word != nullptr)
+        options->format = FindFormat(*word);
+    else if (output.ToStdout())
+        options->format = FindFormat("png");
+    else if (!extension.empty())
+        options->format = FindFormat(extension.substr(1));
+    if (options->format != nullptr)
+        return "";
+    if (word != nullptr)
+        return "--format takes one of " + FormatNames();
+    return (extension.empty() ? "an output without extension needs a --format"
+                              : "no format goes by the extension " + extension) +
+           ": " + FormatNames();
+}
+
 std::string CheckOutput(const RenderOptions& options)
 {
-    const OutputName& output = options.output;
-    const std::string extension = output.Extension();
-    if (!output.ToStdout() && extension != ".png")
-        return (extension.empty() ? "an output without extension" : extension + " output") +
-               " is not supported yet: use .png";
-    if (!output.Numbered() && options.first != options.last)
+    const OutputFormat& format = *options.format;
+    const bool several = options.wholePass || options.duration > 0 || options.first != options.last;
+    if (format.several && options.output.Numbered())
+        return std::string(format.name) + " holds all pictures: its name takes no number";
+    if (!format.several && several && !options.output.Numbered())
         return "several pictures need a number in the name of the output, such as %04d";
+    if (options.Transparent() && !format.alpha)
+        return std::string(format.name) + " cannot be transparent";
     return "";
 }
 
@@ -127,6 +172,8 @@ bool RenderOptions::Parse(std::span<char* const> words)
     else if (!output.Parse(*args.Find("-o")))
         fault = "the name of the output may hold one number, %d or %0Nd";
     else
+        fault = ChooseFormat(args, this);
+    if (fault.empty())
         fault = ParseValues(args, this);
     if (fault.empty())
         fault = CheckOutput(*this);
@@ -136,4 +183,12 @@ bool RenderOptions::Parse(std::span<char* const> words)
     }
     movie = args.Rest()[0];
     return true;
+}
+
+int RenderOptions::LastFor(S32 delay) const
+{
+    if (duration == 0)
+        return last;
+    const int pictures = (duration + delay / 2) / delay;
+    return pictures > 0 ? pictures : 1;
 }

@@ -3,6 +3,7 @@
 
 #include "core/raster/color.h"
 #include "tools/vexel/output_file.h"
+#include "tools/vexel/output_format.h"
 
 #include <span>
 #include <string>
@@ -10,10 +11,12 @@
 struct RenderOptions {
     std::string movie;
     OutputName output;
+    const OutputFormat* format = nullptr;
     bool wholePass = false; // one pass of the main timeline, whatever first and last say
     int first = 1;          // pictures count from 1
     int last = 1;
-    int width = 0; // pixels; 0 x 0 is the movie's own size
+    int duration = 0; // milliseconds; 0: `last` holds
+    int width = 0;    // pixels; 0 x 0 is the movie's own size
     int height = 0;
     int quality = 1; // 0 low, 1 high, 2 best
     bool setBackground = false;
@@ -23,4 +26,6 @@ struct RenderOptions {
     // False after complaining about the command line.
     bool Parse(std::span<char* const> words);
     bool Transparent() const { return setBackground && background.alpha == 0; }
+    // The last picture for a movie whose pictures show for `delay` milliseconds each.
+    int LastFor(S32 delay) const;
 };

@@ -1,0 +1,104 @@
+// What `vexel render` writes besides PNG, read back and compared with the PNG sequence.
+#include "tests/tools/tool.h"
+
+#include <zlib.h>
+
+namespace {
+
+// 31 x 21 pixels, 30 frames a second (33 ms): a square half transparent in pictures 1 to 3, opaque
+// from 4 on beside another; picture 5 stands for two, and the other is gone in 7 and 8.
+std::vector<U8> Squares()
+{
+    MovieWriter m(31 * 20, 21 * 20, Fps(30));
+    m.DefineShape(1, Square({255, 0, 0, 255})).Place2(1, {.character = U16(1)});
+    m.Move(1, Mat::Translate(20, 20), Cx::Alpha(0.6)).Show().Move(1, Mat::Translate(80, 60)).Show();
+    m.Move(1, Mat::Translate(380, 200)).Show().Move(1, Mat::Translate(40, 60), Cx::Alpha(1));
+    m.Place(1, 2, Mat::Translate(380, 200)).Show().Move(1, Mat::Translate(60, 60)).Show(2);
+    m.RemoveDepth(2).Show(2).End();
+    return m.Bytes();
+}
+
+constexpr size_t kBytes = 31 * 21 * 4; // of a picture
+
+// Draws the images of an animated PNG over each other: R, G, B, A of a picture for each 33 ms.
+std::string PlayApng(const std::string& bytes)
+{
+    const auto Number = [](auto& s, size_t i) { return size_t(U8(s[i]) << 8 | U8(s[i + 1])); };
+    const size_t depth = bytes[25] == 6 ? 4 : 3;
+    std::string canvas(kBytes, '\0'), shown, control, chunk;
+    for (size_t at = 33; at < bytes.size(); at += chunk.size() + 8) {
+        chunk = bytes.substr(at + 4, Number(bytes, at + 2) + 4);
+        control = chunk.compare(0, 4, "fcTL") == 0 ? chunk : control;
+        if (chunk.compare(2, 2, "AT") != 0)
+            continue;
+        const size_t start = chunk[0] == 'f' ? 8 : 4, w = Number(control, 10);
+        std::string rows(Number(control, 14) * (w * depth + 1), '\1');
+        uLongf n = rows.size();
+        uncompress((U8*)rows.data(), &n, (const U8*)chunk.data() + start, chunk.size() - start);
+        for (size_t i = 0; i < w * Number(control, 14); i++) {
+            const size_t x = i % w + Number(control, 18), y = i / w + Number(control, 22);
+            const std::string pixel = rows.substr(i * depth + i / w + 1, depth) + '\xff';
+            if (control[29] == 0 || pixel[3] != 0)
+                canvas.replace((y * 31 + x) * 4, 4, pixel, 0, 4);
+        }
+        for (size_t ms = Number(control, 24); ms > 0; ms -= 33)
+            shown += canvas;
+    }
+    return shown;
+}
+
+// In the GIF pictures 6 and 8 are no images of their own.
+TEST_F(Tool, ExportsWhatItRenders)
+{
+    Write("../m", Squares());
+    const std::string all = Run("render ../m -o - --format rgba --background transparent").out;
+    EXPECT_EQ(std::string("\0\0\0\0\xff\0\0\x99", 8), all.substr(5 * 31 * 4, 8));
+    const std::string head = "YUV4MPEG2 W31 H21 F1000:33 Ip A1:1 C420jpeg XCOLORRANGE=LIMITED\n";
+    const std::string video = Run("render ../m --format=y4m -o -").out;
+    ASSERT_EQ(head.size() + 8 * (6 + 651 + 2 * 16 * 11), video.size());
+    EXPECT_EQ(head + "FRAME\n\xeb", video.substr(0, head.size() + 7));
+    const char* red = &video[head.size() + 3 * 1009 + 6];
+    EXPECT_EQ("\x51\x5a\xf0", std::string({red[160], red[651 + 51], red[651 + 176 + 51]}));
+
+    const char* decode = "ffmpeg -v error -i x.gif -vsync 0 -f rawvideo -pix_fmt rgba -";
+    const bool skip = Shell("command -v ffmpeg").code != 0;
+    for (const std::string more : {"", " --background transparent"}) {
+        std::string delays, want = Run("render ../m -o - --format rgba" + more).out;
+        EXPECT_TRUE(want == PlayApng(Run("render ../m -o - --format apng" + more).out)) << more;
+        Run("render ../m -o x.gif" + more);
+        for (size_t at = 0; (at = Read("x.gif").find("!\xf9\4", at + 1)) != std::string::npos;)
+            delays += std::to_string(Read("x.gif")[at + 4]);
+        EXPECT_EQ("343376", delays) << "hundredths, in all 26";
+        want = want.erase(5 * kBytes, kBytes).substr(0, 6 * kBytes);
+        const std::string got = skip ? want : Shell(decode).out;
+        ASSERT_EQ(want.size(), got.size());
+        for (size_t i = 0; i < want.size() && !skip; i += 4)
+            ASSERT_EQ(0, U8(want[i + 3]) > 127 ? want.compare(i, 3, got, i, 3) : got[i + 3]);
+    }
+    if (skip)
+        GTEST_SKIP() << "ffmpeg is not installed: no GIF is decoded";
+}
+
+TEST_F(Tool, ExportsAllOrNothing)
+{
+    Write("../m", Squares());
+    const std::string fake = "f() { printf '#!/bin/sh\n%s' \"$1\" >../ffmpeg; chmod +x ../ffmpeg;"
+                             "PATH=$PWD/..:$PATH $vexel render ../m -o -x.mp4; }; ";
+    const std::pair<std::string, std::string> cases[] = {
+        {"PATH= $vexel render ../m -o x.webm", "x.webm: writing it takes ffmpeg"},
+        {fake + "f 'echo \"[x @ 1] odd\nb\" >&2; cat; exit 1'", "-x.mp4: ffmpeg: odd\n"},
+        {"$vexel render ../m -o /dev/full --format gif", "/dev/full: cannot write: "},
+        {"{ $vexel render ../m -o - --format rgba --size 999x999; echo $? >../code; } | true; "
+         "exit $(cat ../code)",
+         "-: cannot write: "},
+        {"trap '' XFSZ; ulimit -f 1; $vexel render ../m -o x.y4m", "x.y4m: cannot write: "}};
+    for (const auto& [line, said] : cases) {
+        const Outcome outcome = Shell(line);
+        EXPECT_EQ(0u, outcome.err.find("vexel: " + said)) << outcome.err;
+        EXPECT_EQ("1", std::to_string(outcome.code) + Files()) << line;
+    }
+    EXPECT_EQ(0, Shell(fake + "f 'for last; do :; done; wc -c >\"${last#file:}\"'").code);
+    EXPECT_EQ(std::to_string(8 * 32 * 22 * 4) + "\n", Read("-x.mp4"));
+}
+
+} // namespace
