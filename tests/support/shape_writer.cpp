@@ -124,47 +124,38 @@ void ShapeBuilder::Reach(Pt place)
              std::min(reach.ymin, place.y), std::max(reach.ymax, place.y)};
 }
 
-// What a style says, and behind each part of it the end value of a morph's where there is one.
-static void WriteFill(ByteWriter& out, const Fill& fill, bool alpha, const Fill* end)
-{
-    out.PutU8(fill.type);
-    if (!(fill.type & 0x50)) {
-        out.PutColor(fill.color, alpha);
-        return end ? void(out.PutColor(end->color, alpha)) : void();
-    }
-    if (!(fill.type & 0x10))
-        out.PutU16(fill.bitmap);
-    out.PutMatrix(fill.mat);
-    if (end)
-        out.PutMatrix(end->mat);
-    if (!(fill.type & 0x10))
-        return;
-    out.PutU8(U32(fill.stops.size()));
-    for (size_t i = 0; i < fill.stops.size(); i++) {
-        for (const Fill* f : {&fill, end})
-            if (f)
-                out.PutU8(f->stops[i].ratio).PutColor(f->stops[i].color, alpha);
-    }
-}
-
 static void WriteCount(ByteWriter& out, size_t count)
 {
     count < 0xFF ? out.PutU8(U32(count)) : out.PutU8(0xFF).PutU16(U32(count));
 }
 
-void ShapeBuilder::Block::WriteStyles(ByteWriter& out, bool alpha, const Block* end) const
+void ShapeBuilder::WriteStyles(ByteWriter& out, size_t at, bool alpha,
+                               const ShapeBuilder* end) const
 {
-    WriteCount(out, fills.size());
-    for (size_t i = 0; i < fills.size(); i++)
-        WriteFill(out, fills[i], alpha, end ? &end->fills[i] : nullptr);
-    WriteCount(out, lines.size());
-    for (size_t i = 0; i < lines.size(); i++) {
-        out.PutU16(lines[i].width);
-        if (end)
-            out.PutU16(end->lines[i].width);
-        out.PutColor(lines[i].color, alpha);
-        if (end)
-            out.PutColor(end->lines[i].color, alpha);
+    const Block& own = blocks[at];
+    std::vector<const Block*> all = {&own}; // whatever a style says is said for each of these
+    if (end)
+        all.push_back(&end->blocks[at]);
+    WriteCount(out, own.fills.size());
+    for (size_t i = 0; i < own.fills.size(); i++) {
+        const Fill& fill = own.fills[i];
+        out.PutU8(fill.type);
+        if (fill.type & 0x40)
+            out.PutU16(fill.bitmap);
+        for (const Block* b : all)
+            fill.type ? out.PutMatrix(b->fills[i].mat) : out.PutColor(b->fills[i].color, alpha);
+        if (fill.type & 0x10)
+            out.PutU8(U32(fill.stops.size()));
+        for (size_t n = 0; n < fill.stops.size(); n++)
+            for (const Block* b : all)
+                out.PutU8(b->fills[i].stops[n].ratio).PutColor(b->fills[i].stops[n].color, alpha);
+    }
+    WriteCount(out, own.lines.size());
+    for (size_t i = 0; i < own.lines.size(); i++) {
+        for (const Block* b : all)
+            out.PutU16(b->lines[i].width);
+        for (const Block* b : all)
+            out.PutColor(b->lines[i].color, alpha);
     }
 }
 
@@ -206,35 +197,26 @@ void ShapeBuilder::WriteRecords(ByteWriter& out, bool alpha, const ShapeBuilder*
             block->WriteChange(out, record);
         if (record.parts & kNewStyles) {
             block = &blocks[record.block];
-            block->WriteStyles(out, alpha, end ? &end->blocks[record.block] : nullptr);
+            WriteStyles(out, record.block, alpha, end);
             block->WriteWidths(out);
         }
     }
     out.UB(6, 0).Align();
 }
 
-void ShapeBuilder::Write(ByteWriter& out, bool alpha) const
+void ShapeBuilder::Write(ByteWriter& out, bool alpha, const ShapeBuilder* end) const
 {
-    blocks[0].WriteStyles(out, alpha, nullptr);
-    WriteRecords(out, alpha);
+    WriteStyles(out, 0, alpha, end);
+    WriteRecords(out, alpha, end);
 }
 
 void ShapeBuilder::WriteMorph(ByteWriter& out, const ShapeBuilder& end) const
 {
-    blocks[0].WriteStyles(out, true, &end.blocks[0]);
-    WriteRecords(out, true, &end);
-}
-
-void ShapeBuilder::WriteMorphEnd(ByteWriter& out) const
-{
-    const Block bare; // selectors of no bits, which say nothing
-    bare.WriteWidths(out);
-    for (Record record : records) {
-        record.parts &= ~U32(kNewStyles);
-        if (!record.deltas.empty())
-            WriteEdge(out, record.deltas);
-        else if (record.parts != 0)
-            bare.WriteChange(out, record);
-    }
-    out.UB(6, 0).Align();
+    ByteWriter first;
+    Write(first, true, &end);
+    ShapeBuilder bare = end;
+    bare.blocks = {Block()};
+    for (Record& record : bare.records) // moves, and selectors of no bits, which say nothing
+        record.parts = record.parts ? (record.parts & ~U32(kNewStyles)) | kSelector : 0;
+    bare.WriteGlyph(out.PutU32(U32(first.Size())).PutBytes(first.Bytes()));
 }

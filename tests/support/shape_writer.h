@@ -64,14 +64,14 @@ public:
 
     // What the drawing covers, control points and half the widest stroke included.
     Box Bounds() const;
-    // The style block and the records with their end mark.
-    void Write(ByteWriter& out, bool alpha) const;
+    // The style block and the records with their end mark. With `end` all styles are those of a
+    // morph shape, each with the value that the other builder has in its place.
+    void Write(ByteWriter& out, bool alpha, const ShapeBuilder* end = nullptr) const;
     // The records alone behind two 4-bit selector widths, as glyphs keep them.
-    void WriteGlyph(ByteWriter& out) const { WriteRecords(out, false); }
-    // The two parts of a morph shape's body: the start's styles, each with the value that the end
-    // builder has in its place, and records; the end's moves and edges.
+    void WriteGlyph(ByteWriter& out) const { WriteRecords(out, false, nullptr); }
+    // A morph shape's body from the distance on: styles and selectors of this builder, the end
+    // values of the same styles from the other, and the moves and edges of both.
     void WriteMorph(ByteWriter& out, const ShapeBuilder& end) const;
-    void WriteMorphEnd(ByteWriter& out) const;
 
 private:
     enum Selector { kFill0, kFill1, kLine };
@@ -92,7 +92,6 @@ private:
         int top[2] = {0, 0}; // greatest fill and line selector, used or in the table
 
         int Bits(Selector which) const { return UnsignedBits(U32(top[which == kLine])); }
-        void WriteStyles(ByteWriter& out, bool alpha, const Block* end) const;
         void WriteWidths(ByteWriter& out) const
         {
             out.Align().UB(4, U32(Bits(kFill0))).UB(4, U32(Bits(kLine)));
@@ -105,7 +104,8 @@ private:
     ShapeBuilder& Select(Selector which, int selector);
     ShapeBuilder& AddEdge(const std::vector<S32>& deltas, Pt end);
     void Reach(Pt place);
-    void WriteRecords(ByteWriter& out, bool alpha, const ShapeBuilder* end = nullptr) const;
+    void WriteStyles(ByteWriter& out, size_t at, bool alpha, const ShapeBuilder* end) const;
+    void WriteRecords(ByteWriter& out, bool alpha, const ShapeBuilder* end) const;
 
     std::vector<Block> blocks{1};
     std::vector<Record> records;
