@@ -71,6 +71,7 @@ bool DisplayList::SetCamera(const SRECT* frame, const SRECT* client, int aa, S32
     antialias = aa;
     smoothing = smooth;
     supersampling = aa ? 2 : 1;
+    raster.SetSmoothing(smooth);
     raster.SetAntialias(aa); // hit tests may build edges before the first paint
     ModifyCamera();
     return true;

@@ -119,6 +119,7 @@ void SObject::FreeCache()
     while (colors) {
         RColor* next = colors->nextColor;
         colors->FreeCache();
+        ReleaseCharacter(colors->bitmapCharacter);
         display->colorAlloc.Free(colors);
         colors = next;
     }

@@ -2,6 +2,7 @@
 // of one pixel row and resolved to pixels of 4 x 4 samples.
 #include <algorithm>
 
+#include "core/raster/bitmap_fill.h"
 #include "core/raster/gradient.h"
 #include "core/raster/raster.h"
 
@@ -286,8 +287,7 @@ void CRaster::BuildPixelRow(RColor* c, S32 x, S32 n, RGBI* dst)
     } else if (c->colorType == kColorGradient) {
         BuildGradientPixels(c, x, n, dst);
     } else {
-        for (S32 i = 0; i < n; ++i)
-            CalcBitmapPixel(c, x + i, &dst[i]);
+        BuildBitmapPixels(c, x, n, dst);
     }
 }
 

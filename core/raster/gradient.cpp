@@ -281,6 +281,7 @@ void BuildRenderTables()
     for (S32 i = 0; i <= kRampEntries; ++i)
         kSquares[i] = U16(std::min(i * i, 65535));
     BuildRingSquares();
+    BuildBitmapTables();
 }
 
 bool BuildGradientCache(RColor* color)

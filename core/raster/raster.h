@@ -113,6 +113,9 @@ public:
 
     // Tells the units of edges that are built before any paint; Attach sets them as well.
     void SetAntialias(int on) { antialias = on; }
+    // Images that are not drawn at their own size are smoothed, in colours built from now on.
+    void SetSmoothing(int on) { smoothing = on; }
+    int Smoothing() const { return smoothing; }
 
     // --- for the paint procedures of the colours ---
     const CRow& Row() const { return outRow; }
@@ -198,6 +201,7 @@ private:
     bool oddErrors = false;    // the second one is the current row's
     S32 rowY = 0; // current pixel row
     int antialias = 0;
+    int smoothing = 0;
     bool alphaOutput = false;
     SRECT area = {};    // painted pixels, half-open
     SRECT areaDev = {}; // the same in device units

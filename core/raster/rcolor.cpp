@@ -3,6 +3,7 @@
 
 #include <cstring>
 
+#include "core/raster/bitmap_fill.h"
 #include "core/raster/gradient.h"
 #include "core/raster/lanes8.h"
 #include "core/raster/raster.h"
@@ -53,12 +54,6 @@ void CalcSolidPixel(RColor* color, S32, RGBI* dst)
     *dst = color->rgb;
 }
 
-// Bitmap fills keep their solid fallback until images are decoded.
-void CalcBitmapPixel(RColor* color, S32, RGBI* dst)
-{
-    *dst = color->rgb;
-}
-
 void RColor::SetUp(CRaster* r)
 {
     std::memset(static_cast<void*>(this), 0, sizeof *this);
@@ -78,11 +73,13 @@ void RColor::BuildCache()
         return;
     if (colorType == kColorGradient) {
         skipped = !BuildGradientCache(this);
-        transparent = transparent || skipped;
+    } else if (colorType == kColorBitmap) {
+        skipped = !BuildBitmapCache(this);
     } else if (colorType == kColorSolid) {
         drawSlabProc = DrawSolidSlab;
         buildSlabProc = transparent ? CompositeSolidSlab : BuildSolidSlab;
     }
+    transparent = transparent || skipped;
 }
 
 void RColor::FreeCache()
@@ -93,6 +90,8 @@ void RColor::FreeCache()
     pixValid = 0;
     drawSlabProc = DrawNothing;
     buildSlabProc = BuildNothing;
+    if (colorType == kColorBitmap)
+        FreeBitmapCache(this);
     if (builtRamp)
         raster->FreeRamp(builtRamp);
     builtRamp = nullptr;

@@ -6,7 +6,9 @@
 #include "core/raster/color.h"
 
 class CRaster;
+struct RChannelMaps;
 struct RColor;
+struct SCharacter;
 
 enum RColorType : U8 { kColorSolid = 0, kColorBitmap = 1, kColorGradient = 2, kColorClip = 3 };
 
@@ -22,6 +24,11 @@ enum RFillType : U8 {
 using RDrawSlabProc = void (*)(RColor* color, S32 x0, S32 x1);
 // Computes the span into dst[0 .. x1-x0), or blends it over what is there: see RColor.
 using RBuildSlabProc = void (*)(RColor* color, S32 x0, S32 x1, RGBI* dst);
+
+// Samples n pixels of a bitmap colour from x in the raster's current row, untransformed but for a
+// palette.
+using RBitmapRowProc = void (*)(const RColor* color, S32 x, S32 n, RGBI* dst);
+using RBitmapWordsProc = void (*)(const RColor* color, S32 x, S32 n, U32* dst);
 
 constexpr int kRampEntries = 257;
 
@@ -62,13 +69,21 @@ struct RColor {
     GradColorRamp ramp; // stops, colour transform applied
     MATRIX gradientInv; // device point << 8 to gradient square << 8
     U32* builtRamp; // kRampEntries premultiplied pixels a << 24 | r << 16 | g << 8 | b; null: draws
-                    // nothing
+                    // nothing. A bitmap colour with a transform keeps its palette or maps here
 
-    SBitmapCore* bitmap;   // pixels of a bitmap fill, not owned
-    U8 bitmapType;         // kFillTiled, kFillClipped
-    ColorTransform cxform; // the instance's transform, for a bitmap fill
-    MATRIX bitmapMat;      // bitmap pixels to shape
-    MATRIX bitmapInv;      // device point << 16 to bitmap pixels << 16
+    SBitmapCore* bitmap;          // pixels of a bitmap fill; their useCount counts bitmapHeld
+    SCharacter* bitmapCharacter;  // whose pixels they are; counted as a user of the record
+    U8 bitmapType;                // kFillTiled, kFillClipped
+    U8 bitmapHeld;                // the pixels count this colour as a user
+    U8 bitmapUnscaled;            // drawn at its own size: pixels are copied ...
+    SPOINT bitmapOrigin;          // ... the image's first one to this pixel of the output
+    ColorTransform cxform;        // the instance's transform, for a bitmap fill
+    MATRIX bitmapMat;             // bitmap pixels to shape
+    MATRIX bitmapInv;             // device point << 16 to bitmap pixels << 16
+    const U32* bitmapPalette;     // 256 premultiplied words of a colour-mapped image, transformed
+    RChannelMaps* maps;           // the transform for other images; null: none
+    RBitmapRowProc bitmapRow;     // the loop that samples; null: there is nothing to sample
+    RBitmapWordsProc bitmapWords; // the same for words a << 24 | r << 16 | g << 8 | b
 
     // Attaches the raster (may be null: such a colour is never drawn) and clears the links, the
     // flags and the cache; the kind becomes solid and the procedures do nothing.
@@ -96,3 +111,5 @@ void CompositeRGBSolid(const RGBI* c, RGBI* dst, int n);
 
 // Builds the tables shared by all colours. Every CRaster calls it; later calls do nothing.
 void BuildRenderTables();
+// Its part for bitmaps.
+void BuildBitmapTables();

@@ -215,6 +215,10 @@ void SShapeParser::ReadBitmapFill(RColor* color, U8 type)
     SCharacter* ch = player ? player->FindCharacter(id) : nullptr;
     if (!ch || ch->type != kCharBitmap)
         return;
+    if (raster)
+        player->BuildBits(ch);
+    RetainCharacter(ch);
+    color->bitmapCharacter = ch;
     color->colorType = kColorBitmap;
     color->bitmap = &ch->bitmap;
     color->bitmapType = type;
