@@ -8,6 +8,7 @@ struct OutputFormat {
     bool several;     // one file holds all pictures
     bool alpha;       // it can be transparent
     SinkMaker make;
+    CPixelFormat pixels = kPixel32; // what the player has to paint
 };
 
 // The format of that name; null when there is none.

@@ -52,7 +52,7 @@ std::unique_ptr<PictureSink> MakePngSink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeGifSink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeApngSink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeY4mSink(const OutputName& output);
-std::unique_ptr<PictureSink> MakeRgbaSink(const OutputName& output);
+std::unique_ptr<PictureSink> MakeRawSink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeMp4Sink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeWebmSink(const OutputName& output);
 std::unique_ptr<PictureSink> MakeMkvSink(const OutputName& output);

@@ -48,6 +48,7 @@ Renderer::Renderer(const RenderOptions& renderOptions)
                renderOptions.output.Numbered() || renderOptions.format->several)
 {
     player.SetQuality(options.quality);
+    player.SetScreenFormat(options.Screen());
     if (options.setBackground)
         player.OverrideBackground(options.background);
 }

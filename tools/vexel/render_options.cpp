@@ -34,8 +34,7 @@ bool ParseSeconds(const std::string& text, int* milliseconds)
     if (decimals.empty() || decimals.size() > 3)
         return false;
     decimals.resize(3, '0');
-    if (!ParseNumber(whole, 0, kMost, &seconds) ||
-        !ParseNumber(decimals, 0, 999, &rest))
+    if (!ParseNumber(whole, 0, kMost, &seconds) || !ParseNumber(decimals, 0, 999, &rest))
         return false;
     *milliseconds = seconds * 1000 + rest;
     return *milliseconds > 0;
@@ -183,6 +182,15 @@ bool RenderOptions::Parse(std::span<char* const> words)
     }
     movie = args.Rest()[0];
     return true;
+}
+
+// Palettes need dithering more than words of 16 bits do.
+CScreenFormat RenderOptions::Screen() const
+{
+    CScreenFormat screen;
+    screen.pixels = format->pixels;
+    screen.dither = quality >= (screen.pixels == kPixel8 ? 1 : 2);
+    return screen;
 }
 
 int RenderOptions::LastFor(S32 delay) const

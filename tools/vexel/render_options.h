@@ -26,6 +26,8 @@ struct RenderOptions {
     // False after complaining about the command line.
     bool Parse(std::span<char* const> words);
     bool Transparent() const { return setBackground && background.alpha == 0; }
+    // The pixels that the player has to paint.
+    CScreenFormat Screen() const;
     // The last picture for a movie whose pictures show for `delay` milliseconds each.
     int LastFor(S32 delay) const;
 };
