@@ -39,6 +39,16 @@ S64 Rise(const CURVE& c)
     return d < 0 ? -d : d;
 }
 
+// The stepper takes two steps a row, and the crossing is where the step ends that passes the row.
+bool StepsWide(const CURVE& c)
+{
+    const S64 rise = Rise(c);
+    const S64 leg1 = S64{c.control.x} - c.anchor1.x;
+    const S64 leg2 = S64{c.anchor2.x} - c.control.x;
+    const bool wide = leg1 > rise || -leg1 > rise || leg2 > rise || -leg2 > rise;
+    return wide && rise != 0 && CurveFlatness(&c) >= kLineFlatness;
+}
+
 bool WhollyBeyond(const CURVE& c, S32 reach)
 {
     const S32 y1 = c.anchor1.y, y2 = c.control.y, y3 = c.anchor2.y;
@@ -103,7 +113,7 @@ void CEdgeCutter::AddCurve(const CURVE* c)
         return;
     if (!SettleControl(&piece))
         SplitAtTurn(piece);
-    else if (Rise(piece) > kMaxRise)
+    else if (Rise(piece) > kMaxRise || (exact && StepsWide(piece)))
         SplitAtMiddle(piece);
     else
         AddPiece(&piece);

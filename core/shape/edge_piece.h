@@ -53,6 +53,9 @@ public:
 
 protected:
     bool edgesLost = false; // the edge pool is exhausted
+    // Where a curve runs flat the raster's steps are wide. They are kept to a unit, by splitting,
+    // for strokes, whose two sides must not seem to cross.
+    bool exact = false;
 
 private:
     void SplitAtTurn(const CURVE& c);

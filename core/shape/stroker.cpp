@@ -7,8 +7,9 @@ namespace {
 constexpr S32 kThickFrom = 4;
 // Offsets of a greater thickness would all leave what an edge can hold.
 constexpr S32 kMaxThickness = 0x3FFF;
-constexpr S32 kSnapLength = 13; // quarter pixels
-constexpr int kMaxLevel = 5;    // of halving one curve
+constexpr S32 kSnapLength = 13;    // quarter pixels
+constexpr int kMaxLevel = 5;       // of halving one curve
+constexpr S64 kHardlyATurn = 1144; // the sine of 1 degree in 16.16
 
 bool SamePoint(const SPOINT& a, const SPOINT& b)
 {
@@ -70,6 +71,7 @@ SStroker::SStroker(DisplayList* display, REdge** list)
     : CEdgeCutter(display, list), antialias(display->raster.Antialias() != 0)
 {
     fillRule = kRuleWinding;
+    exact = true;
 }
 
 void SStroker::BeginStroke(S32 width, RColor* color)
@@ -183,17 +185,20 @@ void SStroker::Join(const SStrokeEnd& from, const SStrokeEnd& to)
         return;
     }
     const S64 turn = Cross(from.normal, to.normal) / 0x10000;
-    const S64 reach = (turn < 0 ? -turn : turn) * half / 0x10000;
     const S64 shorter = from.length < to.length ? from.length : to.length;
-    const bool tight = reach + reach / 4 > shorter;
-    if (!tight || turn > 0)
+    const bool tight = shorter < half + half / 4;
+    if (tight && turn < -kHardlyATurn) {
+        AddEdge(from.left, to.at);
+        AddEdge(to.at, to.left);
+    } else {
         StrokeJoin(from.left, to.left, to.at);
-    if (!tight || turn <= 0)
+    }
+    if (tight && turn > kHardlyATurn) {
+        AddEdge(to.right, to.at);
+        AddEdge(to.at, from.right);
+    } else {
         StrokeJoin(to.right, from.right, to.at);
-    if (!tight)
-        return;
-    AddEdge(turn > 0 ? to.right : from.left, to.at);
-    AddEdge(to.at, turn > 0 ? from.right : to.left);
+    }
 }
 
 void SStroker::StrokeThickCurve(const CURVE* c)
@@ -280,7 +285,8 @@ SStroker::EBendFate SStroker::Judge(const SBend& b) const
 
 void SStroker::StrokeSides(const SBend& b)
 {
-    const S64 length = LargerExtent(b.p2 - b.p1);
+    // That of the inner side, at the least.
+    const S64 length = LargerExtent(b.p2 - b.p1) / 2;
     const SStrokeEnd start = EndAt(b.p1, b.n1, length);
     Connect(start);
     last = EndAt(b.p2, b.n2, length);
