@@ -6,6 +6,7 @@
 
 #include <cerrno>
 #include <cstring>
+#include <unistd.h>
 
 namespace {
 
@@ -76,6 +77,7 @@ public:
 private:
     Words CommandLine(const PictureForm& form) const;
     bool ToStdout() const { return path == "-"; }
+    bool MakePart();
     bool FailEncoding(const std::string& said);
 
     std::string path;
@@ -125,13 +127,21 @@ bool FfmpegSink::Begin(const PictureForm& form)
     width = video.evenSides ? (form.width + 1) & ~1 : form.width;
     height = video.evenSides ? (form.height + 1) & ~1 : form.height;
     row.resize(static_cast<size_t>(width) * 4);
-    if (!ToStdout())
-        place = OutputPlace(path);
-    making = true;
+    making = !ToStdout();
+    if (making && !MakePart())
+        return Fail(path, Format("cannot write: %s", std::strerror(errno)));
     const int error = child.Start(CommandLine(form), ToStdout());
     if (error == ENOENT)
         return Fail(path, "writing it takes ffmpeg, which is not on the PATH");
     return error == 0 || Fail(path, Format("cannot start ffmpeg: %s", std::strerror(error)));
+}
+
+// What we cannot write ourselves the encoder need not try.
+bool FfmpegSink::MakePart()
+{
+    place = OutputPlace(path);
+    const int fd = place.Open();
+    return fd >= 0 && close(fd) == 0;
 }
 
 bool FfmpegSink::FailEncoding(const std::string& said)

@@ -53,6 +53,7 @@ private:
     OutputFile file;
     PictureForm form = {};
     PictureSpool spool;
+    S64 shown = 0; // pictures
     PaletteBuilder builder;
     GifFileType* gif = nullptr;
     U8 transparent = 0; // the index that leaves alone what is there
@@ -93,6 +94,7 @@ bool GifSink::Add(const CBitBuffer& picture, int)
     const size_t shots = spool.shots.size();
     if (!spool.Add(picture))
         return FailSpool();
+    shown++;
     if (spool.shots.size() > shots)
         CountColors();
     return true;
@@ -222,7 +224,8 @@ bool GifSink::ShowUntil(S64 end, const Indices* next)
     return true;
 }
 
-// A picture whose time would be too short to be shown gives it to the next one.
+// A picture whose time would be too short to be shown gives it to the next one, and so does one
+// that would leave too little for the last.
 bool GifSink::WriteFrames(PaletteMap* map)
 {
     Frame incoming;
@@ -233,7 +236,7 @@ bool GifSink::WriteFrames(PaletteMap* map)
         pictures += spool.shots[i].pictures;
         const S64 end = TimeOf(pictures);
         const bool last = i + 1 == spool.shots.size();
-        if (end - incoming.begin < kShortest && !last)
+        if (!last && (end - incoming.begin < kShortest || TimeOf(shown) - end < kShortest))
             continue;
         MapCanvas(map, &incoming.pixels);
         if (!frame.pixels.empty() && !ShowUntil(incoming.begin, &incoming.pixels))

@@ -99,6 +99,15 @@ OutputPlace::OutputPlace(const std::string& name) : path(name), part(name)
     SetDoomedFile(part);
 }
 
+int OutputPlace::Open() const
+{
+    const int making = Beside() ? O_CREAT | O_TRUNC : 0;
+    const int fd = open(part.c_str(), O_WRONLY | O_CLOEXEC | making, 0666);
+    if (fd < 0)
+        Drop();
+    return fd;
+}
+
 bool OutputPlace::Keep() const
 {
     const bool kept = !Beside() || std::rename(part.c_str(), path.c_str()) == 0;
@@ -146,10 +155,7 @@ bool OutputFile::Open(const std::string& path)
         return true;
     }
     place = OutputPlace(path);
-    const int making = place.Beside() ? O_CREAT | O_TRUNC : 0;
-    fd = open(place.part.c_str(), O_WRONLY | O_CLOEXEC | making, 0666);
-    if (fd < 0)
-        place.Drop();
+    fd = place.Open();
     return fd >= 0 || Fail();
 }
 
