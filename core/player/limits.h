@@ -57,6 +57,8 @@ struct SLimits {
     U32 tagsPerTimeline = 256u << 10;
     // Levels and movies loaded beside the root.
     U32 loadedMovies = 256;
+    // Sounds that play at once, of which the oldest 8 are heard. Further ones do not start.
+    U32 soundChannels = 64;
 };
 
 // The table in force.
