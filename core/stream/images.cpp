@@ -168,8 +168,10 @@ void ReadAlphaPlane(SByteBlock block, SBitmapCore& bitmap, S32 rows)
     U32* word = Words(bitmap);
     size_t left = static_cast<size_t>(rows) * static_cast<size_t>(bitmap.width);
     while (size_t n = data.Read(piece, std::min(left, kAlphaPiece))) {
-        for (size_t i = 0; i < n; ++i)
-            word[i] = LowerToAlpha(word[i], piece[i]);
+        for (size_t i = 0; i < n; ++i) {
+            if (piece[i] != 255)
+                word[i] = LowerToAlpha(word[i], piece[i]);
+        }
         word += n;
         left -= n;
     }

@@ -1,5 +1,7 @@
 // JPEG images: libjpeg over a block of memory.
 #include <algorithm>
+#include <bit>
+#include <cstring>
 
 #include "core/player/limits.h"
 #include "core/stream/images.h"
@@ -108,24 +110,32 @@ void AbsorbScans(JpegDecoder* d)
     jpeg_start_output(info, d->scans);
 }
 
-// Reads each pixel as four bytes, one more than it has: the line is that much longer.
-void StoreLine(const JSAMPLE* line, U32* row, S32 width)
+// Reads each pixel as one word, a byte more than it has: the line is that much longer.
+void StoreLine(const JSAMPLE* line, U8* row, S32 width)
 {
-    for (S32 x = 0; x < width; ++x, line += 3) {
-        const U32 v = U32(line[0]) << 24 | U32(line[1]) << 16 | U32(line[2]) << 8 | line[3];
-        row[x] = 0xFF000000u | v >> 8;
+    for (S32 x = 0; x < width; ++x, line += 3, row += 4) {
+        U32 v;
+        std::memcpy(&v, line, sizeof v);
+        if (std::endian::native == std::endian::little)
+            v = (v & 0xFF) << 16 | (v & 0xFF00) | (v >> 16 & 0xFF);
+        else
+            v >>= 8;
+        v |= 0xFF000000u;
+        std::memcpy(row, &v, sizeof v);
     }
 }
 
+// The line is misaligned on purpose: an aligned one the library may write past the cache, and
+// reading it back takes longer than all the decoding.
 void ReadLines(JpegDecoder* d)
 {
     jpeg_decompress_struct* info = &d->info;
     const SBitmapCore& bitmap = d->ch->bitmap;
-    JSAMPARRAY line = info->mem->alloc_sarray(reinterpret_cast<j_common_ptr>(info), JPOOL_IMAGE,
-                                              info->output_width * 3 + 1, 1);
-    while (d->rows < bitmap.height && jpeg_read_scanlines(info, line, 1) == 1) {
-        U8* row = bitmap.baseAddr + ptrdiff_t(d->rows) * bitmap.rowBytes;
-        StoreLine(line[0], reinterpret_cast<U32*>(row), bitmap.width);
+    JSAMPARRAY lines = info->mem->alloc_sarray(reinterpret_cast<j_common_ptr>(info), JPOOL_IMAGE,
+                                               info->output_width * 3 + 2, 1);
+    JSAMPROW line = lines[0] + 1;
+    while (d->rows < bitmap.height && jpeg_read_scanlines(info, &line, 1) == 1) {
+        StoreLine(line, bitmap.baseAddr + ptrdiff_t(d->rows) * bitmap.rowBytes, bitmap.width);
         d->rows++;
     }
 }

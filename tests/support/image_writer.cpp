@@ -33,9 +33,8 @@ std::vector<U8> LosslessBody(const ImageSource& image, bool alpha)
 
 // The words are handed over as the bytes they are on a little-endian machine. Both streams go to
 // one block of memory, one after the other.
-JpegStreams MakeJpeg(const ImageSource& image, int components, bool progressive)
+JpegStreams MakeJpeg(const ImageSource& image, bool progressive, bool inks)
 {
-    const J_COLOR_SPACE spaces[] = {JCS_GRAYSCALE, JCS_UNKNOWN, JCS_YCbCr, JCS_CMYK};
     jpeg_compress_struct info = {};
     jpeg_error_mgr errors;
     U8* data = nullptr;
@@ -46,9 +45,8 @@ JpegStreams MakeJpeg(const ImageSource& image, int components, bool progressive)
     info.image_width = unsigned(image.width);
     info.image_height = unsigned(image.height);
     info.input_components = 4;
-    info.in_color_space = components == 4 ? JCS_CMYK : JCS_EXT_BGRX;
+    info.in_color_space = inks ? JCS_CMYK : JCS_EXT_BGRX;
     jpeg_set_defaults(&info);
-    jpeg_set_colorspace(&info, spaces[components - 1]);
     if (progressive)
         jpeg_simple_progression(&info);
     jpeg_write_tables(&info);

@@ -16,8 +16,8 @@ struct JpegStreams {
     std::vector<U8> tables, image, whole;
 };
 
-// Components: 3, or 1 for grey, or 4 for inks from the word's bytes.
-JpegStreams MakeJpeg(const ImageSource& image, int components = 3, bool progressive = false);
+// Progressive: in several scans. Inks: the bytes of the words are four inks instead of colours.
+JpegStreams MakeJpeg(const ImageSource& image, bool progressive = false, bool inks = false);
 
 // What follows the id in image tags of codes 20 and, with alpha, 36. In codes 6 and 21 that is a
 // JPEG stream alone; in 35 its size (32 bits), the stream, and an alpha plane of a byte a pixel,
