@@ -24,9 +24,9 @@ int main(int argc, char** argv)
         const char* name;
         std::vector<U8> (*make)();
     } movies[] = {
-        {"viaduct.vxm", MakeViaduct},
-        {"clockwork.vxm", MakeClockwork},
-        {"shapes.vxm", MakeShapes},
+        {"viaduct.vxm", MakeViaduct}, {"clockwork.vxm", MakeClockwork},
+        {"shapes.vxm", MakeShapes},   {"poster.vxm", MakePoster},
+        {"gallery.vxm", MakeGallery}, {"metamorphosis.vxm", MakeMetamorphosis},
     };
     for (const auto& movie : movies) {
         std::string path = std::string(argv[1]) + "/" + movie.name;

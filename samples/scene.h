@@ -113,3 +113,6 @@ TagWriter TurningSprite(U16 character, int frames, double degrees);
 std::vector<U8> MakeViaduct();
 std::vector<U8> MakeClockwork();
 std::vector<U8> MakeShapes();
+std::vector<U8> MakePoster();
+std::vector<U8> MakeGallery();
+std::vector<U8> MakeMetamorphosis();

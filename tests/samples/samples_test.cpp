@@ -18,9 +18,9 @@ TEST(Samples, AreWhatIsCommittedAndRepaintAlike)
         const char* name;
         std::vector<U8> made;
         int frames;
-    } samples[] = {{"viaduct", MakeViaduct(), 120},
-                   {"clockwork", MakeClockwork(), 96},
-                   {"shapes", MakeShapes(), 1}};
+    } samples[] = {{"viaduct", MakeViaduct(), 120}, {"clockwork", MakeClockwork(), 96},
+                   {"shapes", MakeShapes(), 1},     {"poster", MakePoster(), 120},
+                   {"gallery", MakeGallery(), 96},  {"metamorphosis", MakeMetamorphosis(), 96}};
     for (const auto& [name, made, frames] : samples) {
         SCOPED_TRACE(name);
         std::ifstream file(VEXEL_SOURCE_DIR "/samples/" + std::string(name) + ".vxm",
