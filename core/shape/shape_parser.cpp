@@ -136,7 +136,7 @@ template <typename Bits> void SShapeParser::ReadEdge(Bits& bits, CURVE* c)
     c->isLine = straight;
 }
 
-inline int SShapeParser::ReadRecord(CURVE* c)
+int SShapeParser::ReadRecord(CURVE* c)
 {
     if (limit - pos >= kEdgeBytes) {
         QuickBits bits(*this);
