@@ -51,9 +51,9 @@ TEST(Text, EqualsItsGlyphsAsShapes)
 
 TEST(Text, MasksAndIsHitWhereItIsDrawn)
 {
-    const TextRun first = {.font = {{1, 512}}, .x = 100, .y = 500, .glyphs = {{0, 500}}};
+    const Rgba gray = {9, 9, 9};
     MovieWriter movie =
-        Text(kTagDefineText, {}, {first, {.color = {{0, 0, 9}}, .glyphs = {{2, 500}}}});
+        Text(kTagDefineText, {}, {{{{1, 512}}, gray, 100, 500, {{0, 500}, {2, 500}}}});
     movie.DefineShape(4, Square({0, 0, 255}, 60));
     Scene drawn(movie), masked(movie);
     drawn.Place(1, 3);
