@@ -13,9 +13,10 @@ missing_packages() {
         pkg-config --exists libgif || echo libgif-dev
         pkg-config --exists zlib || echo zlib1g-dev
         pkg-config --exists libjpeg || echo libjpeg-dev
+        pkg-config --exists libmpg123 || echo libmpg123-dev
         [[ ${1:-} != test ]] || pkg-config --exists gtest || echo libgtest-dev
     else
-        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev ${1:+libgtest-dev}
+        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev ${1:+libgtest-dev}
     fi
 }
 
