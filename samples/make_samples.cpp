@@ -1,9 +1,12 @@
 #include "samples/scene.h"
 
 #include <cstdio>
+#include <fstream>
+#include <iterator>
 #include <string>
 
-// Writes every sample movie into the folder given: make_samples FOLDER.
+// Writes every sample movie into the folder given: make_samples FOLDER. The images of album.vxm are
+// kept when it is there already; delete it to pack them anew.
 
 static bool Save(const std::string& path, const std::vector<U8>& bytes)
 {
@@ -14,24 +17,35 @@ static bool Save(const std::string& path, const std::vector<U8>& bytes)
     return (std::fclose(file) == 0) && whole;
 }
 
+// Nothing when there is no such file.
+static std::vector<U8> Load(const std::string& path)
+{
+    std::ifstream file(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
 int main(int argc, char** argv)
 {
     if (argc != 2) {
         std::fprintf(stderr, "usage: make_samples FOLDER\n");
         return 2;
     }
+    const std::string folder = argv[1] + std::string("/");
     const struct {
         const char* name;
-        std::vector<U8> (*make)();
+        std::vector<U8> bytes;
     } movies[] = {
-        {"viaduct.vxm", MakeViaduct}, {"clockwork.vxm", MakeClockwork},
-        {"shapes.vxm", MakeShapes},   {"poster.vxm", MakePoster},
-        {"gallery.vxm", MakeGallery}, {"metamorphosis.vxm", MakeMetamorphosis},
+        {"viaduct.vxm", MakeViaduct()},
+        {"clockwork.vxm", MakeClockwork()},
+        {"shapes.vxm", MakeShapes()},
+        {"poster.vxm", MakePoster()},
+        {"gallery.vxm", MakeGallery()},
+        {"metamorphosis.vxm", MakeMetamorphosis()},
+        {"album.vxm", MakeAlbum(Load(folder + "album.vxm"))},
     };
     for (const auto& movie : movies) {
-        std::string path = std::string(argv[1]) + "/" + movie.name;
-        if (!Save(path, movie.make())) {
-            std::fprintf(stderr, "make_samples: cannot write %s\n", path.c_str());
+        if (!Save(folder + movie.name, movie.bytes)) {
+            std::fprintf(stderr, "make_samples: cannot write %s%s\n", folder.c_str(), movie.name);
             return 1;
         }
     }

@@ -9,6 +9,12 @@
 
 namespace {
 
+std::vector<U8> Committed(const std::string& name)
+{
+    std::ifstream file(VEXEL_SOURCE_DIR "/samples/" + name + ".vxm", std::ios::binary);
+    return {std::istreambuf_iterator<char>(file), {}};
+}
+
 // The committed movies are what the program writes on every machine, and all of their pictures are
 // the same whether only what changed is painted or everything. Where a radial span starts may cost
 // a step of its ramp.
@@ -18,14 +24,16 @@ TEST(Samples, AreWhatIsCommittedAndRepaintAlike)
         const char* name;
         std::vector<U8> made;
         int frames;
-    } samples[] = {{"viaduct", MakeViaduct(), 120}, {"clockwork", MakeClockwork(), 96},
-                   {"shapes", MakeShapes(), 1},     {"poster", MakePoster(), 120},
-                   {"gallery", MakeGallery(), 96},  {"metamorphosis", MakeMetamorphosis(), 96}};
+    } samples[] = {{"viaduct", MakeViaduct(), 120},
+                   {"clockwork", MakeClockwork(), 96},
+                   {"shapes", MakeShapes(), 1},
+                   {"poster", MakePoster(), 120},
+                   {"gallery", MakeGallery(), 96},
+                   {"metamorphosis", MakeMetamorphosis(), 96},
+                   {"album", MakeAlbum(Committed("album")), 120}};
     for (const auto& [name, made, frames] : samples) {
         SCOPED_TRACE(name);
-        std::ifstream file(VEXEL_SOURCE_DIR "/samples/" + std::string(name) + ".vxm",
-                           std::ios::binary);
-        EXPECT_TRUE(std::vector<U8>(std::istreambuf_iterator<char>(file), {}) == made);
+        EXPECT_TRUE(Committed(name) == made);
         NativePlayerWnd player(160, 120);
         player.Feed(made.data(), made.size());
         player.EndOfData();
