@@ -1,7 +1,8 @@
 # Sourced by the scripts at the top: what must be on the machine before anything can be built.
 # Everything is Debian's; nothing is fetched when nothing is missing.
 
-# Prints the package behind each thing that is not there. Arguments: "test" adds the test library.
+# Prints the package behind each thing that is not there. Arguments: "test" adds what
+# only tests need.
 missing_packages() {
     local tool
     for tool in g++ cmake pkg-config; do
@@ -15,8 +16,9 @@ missing_packages() {
         pkg-config --exists libjpeg || echo libjpeg-dev
         pkg-config --exists libmpg123 || echo libmpg123-dev
         [[ ${1:-} != test ]] || pkg-config --exists gtest || echo libgtest-dev
+        [[ ${1:-} != test ]] || pkg-config --exists sdl2 || echo libsdl2-dev
     else
-        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev ${1:+libgtest-dev}
+        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev ${1:+libgtest-dev libsdl2-dev}
     fi
 }
 
