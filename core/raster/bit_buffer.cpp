@@ -48,7 +48,7 @@ static void RampRow32(const CRow& row, S32 x, const U32* ramp, const U16* index,
         dst[i] = ramp[index[i]];
 }
 
-static const CPixelOps kOps32 = {32,         false,     Pack32,    ReadRow32,
+static const CPixelOps kOps32 = {32,         true,      false,     Pack32,   ReadRow32,
                                  WriteRow32, FillRow32, CopyRow32, RampRow32};
 
 const CPixelOps* PixelOps(CPixelFormat format, bool dither)

@@ -41,6 +41,7 @@ struct CRow {
 // What a format can do with `n` pixels from column x of a row. Sources are premultiplied.
 struct CPixelOps {
     int bitsPerPixel;
+    bool isWords;  // rows hold the words that copyRow takes as they are
     bool diffuses; // writeRow, copyRow and rampRow use the row's errors, from left to right
     // A colour as fillRow takes it: the pixel, or four of them in a dithered format. Of `row` only
     // the palette counts.

@@ -109,6 +109,10 @@ void FindOrigin(RColor* color)
 void DrawBitmapSlab(RColor* color, S32 x0, S32 x1)
 {
     const CRaster* raster = color->raster;
+    if (raster->Ops()->isWords) {
+        color->bitmapWords(color, x0, x1 - x0, reinterpret_cast<U32*>(raster->Row().bits) + x0);
+        return;
+    }
     U32 row[kPiece];
     for (S32 x = x0; x < x1; x += kPiece) {
         const S32 n = std::min(kPiece, x1 - x);

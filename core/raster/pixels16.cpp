@@ -156,6 +156,7 @@ void RampRow(const CRow& row, S32 x, const U32* ramp, const U16* index, S32 n)
 
 template <typename Format, bool kDiffused>
 constexpr CPixelOps kOps = {16,
+                            false,
                             kDiffused,
                             PackColor<Format>,
                             ReadRow<Format>,

@@ -104,6 +104,7 @@ void RampRow(const CRow& row, S32 x, const U32* ramp, const U16* index, S32 n)
 template <bool kDithered>
 constexpr CPixelOps kOps = {8,
                             false,
+                            false,
                             PackColor<kDithered>,
                             ReadRow,
                             WriteRow<kDithered>,
