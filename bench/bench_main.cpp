@@ -54,7 +54,8 @@ void RegisterAll(const BenchMovie& m, Size s)
         Register("tick", m, s, q, [](BenchScene& b) { b.player.Tick(); });
     }
 #ifdef VEXEL_BENCH_CAIRO
-    RegisterCairo(m, s);
+    if (m.inCairo)
+        RegisterCairo(m, s);
 #endif
 }
 

@@ -1,11 +1,13 @@
 #include "bench/cairo_scene.h"
 
 #include <algorithm>
+#include <cmath>
 #include <map>
 #include <utility>
 
 #include "core/shape/shape_parser.h"
-#include "core/stream/character.h"
+#include "core/shape/text_records.h"
+#include "core/stream/script_player.h"
 
 namespace {
 
@@ -15,6 +17,12 @@ struct Segment {
     Place from, control, to;
     bool line;
 };
+
+cairo_pattern_t* SolidPattern(SRGB c)
+{
+    return cairo_pattern_create_rgba(c.red / 255.0, c.green / 255.0, c.blue / 255.0,
+                                     c.alpha / 255.0);
+}
 
 cairo_matrix_t ToCairo(const MATRIX& m)
 {
@@ -60,6 +68,20 @@ private:
         cairo_close_path(cr);
     }
 
+public:
+    // As one open line after another, in the order drawn.
+    void TraceLines(cairo_t* cr) const
+    {
+        const Segment* last = nullptr;
+        for (const Segment& s : pieces) {
+            if (!last || last->to != s.from)
+                cairo_move_to(cr, s.from.first, s.from.second);
+            TracePiece(cr, s);
+            last = &s;
+        }
+    }
+
+private:
     static void TracePiece(cairo_t* cr, const Segment& s)
     {
         auto third = [](S32 end, S32 control) { return (end + 2.0 * control) / 3; };
@@ -73,11 +95,18 @@ private:
     }
 };
 
+// All pieces of one style.
+struct CairoScene::Painted {
+    Contours outline;
+    double width = 0; // of a line style
+};
+
 CairoScene::CairoScene(NativePlayerWnd* p) : player(p)
 {
     surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, p->Width(), p->Height());
     cr = cairo_create(surface);
-    cairo_set_fill_rule(cr, CAIRO_FILL_RULE_EVEN_ODD);
+    cairo_set_line_join(cr, CAIRO_LINE_JOIN_ROUND);
+    cairo_set_line_cap(cr, CAIRO_LINE_CAP_ROUND);
     STransform camera;
     camera.mat = p->scene.camera;
     camera.cxform.Clear();
@@ -124,6 +153,8 @@ void CairoScene::AddTree(SObject* obj, STransform xform)
 void CairoScene::AddShape(SObject* obj, const STransform& xform, bool clip)
 {
     SCharacter* ch = obj->character;
+    if (ch && ch->type == kCharText)
+        return AddText(obj, xform);
     if (!ch || ch->type != kCharShape)
         return;
     RColor* colors = nullptr;
@@ -132,7 +163,7 @@ void CairoScene::AddShape(SObject* obj, const STransform& xform, bool clip)
     SShapeParser parser(ch->player, &player->scene, &colors, ch->data, ch->DataLen(), 0, &identity);
     parser.getAlpha = ch->tagCode == 32;
     parser.cxform = xform.cxform;
-    std::map<std::pair<U32, RColor*>, Contours> outlines;
+    std::map<std::pair<U32, RColor*>, Painted> outlines;
     Contours mask;
     CURVE c;
     bool good = parser.GetStyles();
@@ -140,33 +171,107 @@ void CairoScene::AddShape(SObject* obj, const STransform& xform, bool clip)
         flags = parser.GetEdge(&c);
         if (flags)
             continue;
+        const SLineStyle line = parser.LineStyle(parser.line);
+        if (line.color && !clip) {
+            Painted& stroke = outlines[{line.color->order, line.color}];
+            stroke.width = line.thickness;
+            stroke.outline.Add(c, false);
+        }
         RColor* f0 = parser.Fill(parser.fill0);
         RColor* f1 = parser.Fill(parser.fill1);
         if (f0 == f1)
             continue;
         if (f0)
-            (clip ? mask : outlines[{f0->order, f0}]).Add(c, true);
+            (clip ? mask : outlines[{f0->order, f0}].outline).Add(c, true);
         if (f1)
-            (clip ? mask : outlines[{f1->order, f1}]).Add(c, false);
+            (clip ? mask : outlines[{f1->order, f1}].outline).Add(c, false);
     }
     if (clip)
         AddItem(mask, nullptr, xform.mat);
-    for (auto& [key, outline] : outlines)
-        AddItem(outline, PatternOf(key.second), xform.mat);
+    for (auto& [key, painted] : outlines) {
+        AddItem(painted.outline, PatternOf(key.second), xform.mat);
+        if (painted.width > 0)
+            MakeStroke(&items.back(), painted);
+    }
+    Free(colors);
+}
+
+void CairoScene::Free(RColor* colors)
+{
     while (RColor* gone = colors) {
         colors = gone->nextColor;
+        ReleaseCharacter(gone->bitmapCharacter);
         player->scene.colorAlloc.Free(gone);
     }
 }
 
-void CairoScene::AddItem(const Contours& outline, cairo_pattern_t* paint, const MATRIX& mat)
+// Lines as the player draws them: never thinner than a pixel, round at joins and ends.
+void CairoScene::MakeStroke(Item* item, const Painted& painted)
 {
-    Item item = {nullptr, paint, ToCairo(mat), false};
+    cairo_path_destroy(item->path);
+    cairo_new_path(cr);
+    painted.outline.TraceLines(cr);
+    item->path = cairo_copy_path(cr);
+    double x = 1, y = 1;
+    cairo_matrix_transform_distance(&item->matrix, &x, &y);
+    item->width = std::max(painted.width, 1.414 / std::hypot(x, y));
+}
+
+// All letters of one colour are one path.
+void CairoScene::AddText(SObject* obj, const STransform& xform)
+{
+    STextRecords records(obj->character);
+    Contours letters;
+    SRGB value = records.color;
+    const auto flush = [&] {
+        if (!letters.pieces.empty())
+            AddItem(letters, SolidPattern(value), xform.mat);
+        if (!letters.pieces.empty())
+            items.back().winding = true;
+        letters.pieces.clear();
+        value = records.color;
+    };
+    for (auto what = records.Next(); what != STextRecords::kEnd; what = records.Next()) {
+        if (what == STextRecords::kGlyph)
+            AddGlyph(records, &letters);
+        else if (!(records.color == value))
+            flush();
+    }
+    flush();
+}
+
+void CairoScene::AddGlyph(const STextRecords& text, Contours* letters)
+{
+    const SBytes glyph = text.font.Glyph(text.glyph);
+    if (glyph.len == 0)
+        return;
+    MATRIX mat = text.GlyphMatrix();
+    MatrixConcat(&mat, &text.mat, &mat);
+    RColor* none = nullptr;
+    SShapeParser parser(nullptr, &player->scene, &none, glyph.at, S32(glyph.len), 0, &mat);
+    parser.GetSelectorWidths();
+    CURVE c;
+    for (int flags = 0; flags != SShapeParser::kEndOfShape;) {
+        flags = parser.GetEdge(&c);
+        if (flags == 0)
+            letters->Add(c, false);
+    }
+}
+
+cairo_matrix_t CairoScene::DeviceMatrix(const MATRIX& mat) const
+{
+    cairo_matrix_t m = ToCairo(mat);
     if (player->scene.antialias) {
         cairo_matrix_t quarter;
         cairo_matrix_init_scale(&quarter, 0.25, 0.25);
-        cairo_matrix_multiply(&item.matrix, &item.matrix, &quarter);
+        cairo_matrix_multiply(&m, &m, &quarter);
     }
+    return m;
+}
+
+void CairoScene::AddItem(const Contours& outline, cairo_pattern_t* paint, const MATRIX& mat)
+{
+    Item item = {nullptr, paint, DeviceMatrix(mat), false};
     cairo_identity_matrix(cr);
     cairo_new_path(cr);
     outline.Trace(cr);
@@ -176,6 +281,8 @@ void CairoScene::AddItem(const Contours& outline, cairo_pattern_t* paint, const 
 
 cairo_pattern_t* CairoScene::PatternOf(const RColor* color) const
 {
+    if (color->colorType == kColorBitmap)
+        return ImagePattern(color);
     if (color->colorType != kColorGradient) {
         double a = color->rgb.alpha ? color->rgb.alpha : 1;
         return cairo_pattern_create_rgba(color->rgb.red / a, color->rgb.green / a,
@@ -200,6 +307,25 @@ cairo_pattern_t* CairoScene::PatternOf(const RColor* color) const
     return p;
 }
 
+// The player's own pixels, which have cairo's layout when they are 32 bits wide.
+cairo_pattern_t* CairoScene::ImagePattern(const RColor* color) const
+{
+    SBitmapCore* image = color->bitmap;
+    if (!player->BuildBits(color->bitmapCharacter) || image->bmFormat != 5)
+        return cairo_pattern_create_rgb(1, 0, 0);
+    const auto format = image->transparent ? CAIRO_FORMAT_ARGB32 : CAIRO_FORMAT_RGB24;
+    cairo_surface_t* pixels = cairo_image_surface_create_for_data(
+        image->baseAddr, format, image->width, image->height, image->rowBytes);
+    cairo_pattern_t* p = cairo_pattern_create_for_surface(pixels);
+    cairo_surface_destroy(pixels);
+    cairo_pattern_set_extend(p, color->bitmapType & 1 ? CAIRO_EXTEND_PAD : CAIRO_EXTEND_REPEAT);
+    cairo_pattern_set_filter(p, CAIRO_FILTER_BILINEAR);
+    cairo_matrix_t m = ToCairo(color->bitmapMat);
+    if (cairo_matrix_invert(&m) == CAIRO_STATUS_SUCCESS)
+        cairo_pattern_set_matrix(p, &m);
+    return p;
+}
+
 void CairoScene::Draw()
 {
     SRGB stage = player->scene.backgroundColor;
@@ -219,7 +345,12 @@ void CairoScene::Draw()
             continue;
         }
         cairo_set_source(cr, item.paint);
-        cairo_fill(cr);
+        cairo_set_fill_rule(cr, item.winding ? CAIRO_FILL_RULE_WINDING : CAIRO_FILL_RULE_EVEN_ODD);
+        cairo_set_line_width(cr, item.width);
+        if (item.width > 0)
+            cairo_stroke(cr);
+        else
+            cairo_fill(cr);
     }
     cairo_surface_flush(surface);
 }

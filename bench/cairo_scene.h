@@ -9,6 +9,8 @@
 #include "core/display/sobject.h"
 #include "platform/headless/native_player.h"
 
+class STextRecords;
+
 class CairoScene {
 public:
     explicit CairoScene(NativePlayerWnd* player);
@@ -27,14 +29,23 @@ private:
         cairo_path_t* path;
         cairo_pattern_t* paint; // null: a clip that the following items lie under
         cairo_matrix_t matrix;
-        bool endClip; // no path: the clip ends here
+        bool endClip;     // no path: the clip ends here
+        double width = 0; // above 0: a stroke, units of the path
+        bool winding = false;
     };
     struct Contours;
+    struct Painted;
 
     void AddTree(SObject* obj, STransform xform);
     void AddShape(SObject* obj, const STransform& xform, bool clip);
+    void MakeStroke(Item* item, const Painted& painted);
+    void AddText(SObject* obj, const STransform& xform);
+    void AddGlyph(const STextRecords& text, Contours* letters);
     void AddItem(const Contours& outline, cairo_pattern_t* paint, const MATRIX& mat);
+    cairo_matrix_t DeviceMatrix(const MATRIX& mat) const;
     cairo_pattern_t* PatternOf(const RColor* color) const;
+    cairo_pattern_t* ImagePattern(const RColor* color) const;
+    void Free(RColor* colors);
 
     NativePlayerWnd* player;
     cairo_surface_t* surface;

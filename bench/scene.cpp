@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <cstdlib>
 
+#include "bench/movies.h"
 #include "tests/support/movie_writer.h"
 
 const std::vector<BenchMovie>& BenchMovies()
@@ -16,6 +17,11 @@ const std::vector<BenchMovie>& BenchMovies()
                 {name, std::string(VEXEL_SOURCE_DIR "/tests/data/art/") + name + ".vxm", 0});
         for (const char* name : {"viaduct", "clockwork", "shapes"})
             all.push_back({name, std::string(VEXEL_SOURCE_DIR "/samples/") + name + ".vxm", 20});
+        all.push_back({"page", "", 0, PageMovie});
+        all.push_back({"photo", "", 0, PhotoMovie});
+        all.push_back({"enlarged", "", 0, EnlargedMovie});
+        all.push_back({"turned", "", 0, TurnedMovie});
+        all.push_back({"morphs", "", 0, MorphMovie, false});
         return all;
     }();
     return kMovies;
@@ -40,7 +46,7 @@ BenchScene::BenchScene(const BenchMovie& movie, S32 width, S32 height, int quali
     : player(width, height)
 {
     player.SetQuality(quality);
-    std::vector<U8> bytes = ReadFile(movie.path);
+    std::vector<U8> bytes = movie.make ? movie.make() : ReadFile(movie.path);
     player.Feed(bytes.data(), bytes.size());
     player.EndOfData();
     for (int i = 0; i < movie.stillFrame; ++i)

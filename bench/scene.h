@@ -10,7 +10,9 @@
 struct BenchMovie {
     std::string name;
     std::string path;
-    int stillFrame; // ticks before measuring
+    int stillFrame;                      // ticks before measuring
+    std::vector<U8> (*make)() = nullptr; // in place of a file
+    bool inCairo = true;                 // cairo draws it too
 };
 
 // The art and the samples, heaviest classes first.
