@@ -78,6 +78,7 @@ private:
     void Add(Vec a, Vec b, Vec c, bool straight);
     void Quarter(bool level);
     void Ring(Vec middle, Vec radius);
+    static Side Oval(Vec middle, Vec radius, double sense);
     void Lift();
     Vec Rim(const Part& part, double t, double side) const;
     Vec RimHeading(const Part& part, double t, double side) const;
@@ -202,34 +203,35 @@ void Pen::Quarter(bool level)
     Add(pen + leave, to - arrive, to, false);
 }
 
-// Both rims are closed contours of four quarter turns; the inner one, if any, is a hole.
+// Both rims are closed contours; the inner one, if there is room for it, is a hole.
 void Pen::Ring(Vec middle, Vec radius)
 {
     Lift();
     Vec nib = Vec{kNibWidth, kNibHeight} * (width * place.percent / 200);
     if (nib.x > radius.x - 1) // a disc: as high as wide
         nib.y = nib.x;
-    for (double sign : {1.0, -1.0}) {
-        Vec r = {radius.x + sign * nib.x, radius.y + sign * nib.y};
-        if (r.x <= 1 || r.y <= 1)
-            continue;
-        const Vec tips[] = {{r.x, 0}, {0, sign * r.y}, {-r.x, 0}, {0, -sign * r.y}};
-        Side whole;
-        whole.ends = {middle + tips[0]};
-        for (int i = 0; i < 4; i++) {
-            Vec a = tips[i], c = tips[(i + 1) % 4], corner = a + c;
-            Part turn = {{a, a + (corner - a) * kReach, c + (corner - c) * kReach, c}, 1, 1, false};
-            for (int n = 0; n < kSteps; n++) {
-                double t0 = n / double(kSteps), t1 = (n + 1) / double(kSteps);
-                Vec h0 = turn.Heading(t0), h1 = turn.Heading(t1), gap = turn.At(t1) - turn.At(t0);
-                Vec control = turn.At(t0) + h0 * (Cross(gap, h1) / Cross(h0, h1));
-                whole.controls.push_back(middle + control);
-                whole.ends.push_back(middle + turn.At(t1));
-                whole.curved.push_back(true);
-            }
-        }
-        Emit(whole);
+    Emit(Oval(middle, radius + nib, 1));
+    if (nib.x < radius.x - 1 && nib.y < radius.y - 1)
+        Emit(Oval(middle, radius - nib, -1));
+}
+
+// Four quarter turns, the way strokes go round when `sense` is 1, else the other.
+Side Pen::Oval(Vec middle, Vec radius, double sense)
+{
+    const Vec tips[] = {
+        {radius.x, 0}, {0, sense * radius.y}, {-radius.x, 0}, {0, -sense * radius.y}};
+    Side whole;
+    whole.ends = {middle + tips[0]};
+    for (int i = 0; i < 4 * kSteps; i++) {
+        Vec a = tips[i / kSteps], c = tips[(i / kSteps + 1) % 4], corner = a + c;
+        Part turn = {{a, a + (corner - a) * kReach, c + (corner - c) * kReach, c}, 1, 1, false};
+        double t0 = i % kSteps / double(kSteps), t1 = (i % kSteps + 1) / double(kSteps);
+        Vec h0 = turn.Heading(t0), h1 = turn.Heading(t1), gap = turn.At(t1) - turn.At(t0);
+        whole.controls.push_back(middle + turn.At(t0) + h0 * (Cross(gap, h1) / Cross(h0, h1)));
+        whole.ends.push_back(middle + turn.At(t1));
+        whole.curved.push_back(true);
     }
+    return whole;
 }
 
 // The place on the nib's edge that lies farthest to one side of where the pen is heading.
