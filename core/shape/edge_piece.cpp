@@ -40,13 +40,14 @@ S64 Rise(const CURVE& c)
 }
 
 // The stepper takes two steps a row, and the crossing is where the step ends that passes the row.
+// Pieces of a circle of an eighth still pass.
 bool StepsWide(const CURVE& c)
 {
-    const S64 rise = Rise(c);
+    const S64 limit = Rise(c) * 3 / 2;
     const S64 leg1 = S64{c.control.x} - c.anchor1.x;
     const S64 leg2 = S64{c.anchor2.x} - c.control.x;
-    const bool wide = leg1 > rise || -leg1 > rise || leg2 > rise || -leg2 > rise;
-    return wide && rise != 0 && CurveFlatness(&c) >= kLineFlatness;
+    const bool wide = leg1 > limit || -leg1 > limit || leg2 > limit || -leg2 > limit;
+    return wide && limit != 0 && CurveFlatness(&c) >= kLineFlatness && PieceFits(c);
 }
 
 bool WhollyBeyond(const CURVE& c, S32 reach)
@@ -113,7 +114,7 @@ void CEdgeCutter::AddCurve(const CURVE* c)
         return;
     if (!SettleControl(&piece))
         SplitAtTurn(piece);
-    else if (Rise(piece) > kMaxRise || (exact && StepsWide(piece)))
+    else if (Rise(piece) > kMaxRise || (exact && depth < kMaxDepth && StepsWide(piece)))
         SplitAtMiddle(piece);
     else
         AddPiece(&piece);

@@ -53,8 +53,8 @@ public:
 
 protected:
     bool edgesLost = false; // the edge pool is exhausted
-    // Where a curve runs flat the raster's steps are wide. They are kept to a unit, by splitting,
-    // for strokes, whose two sides must not seem to cross.
+    // Where a curve runs flat the anti-aliasing raster's steps along it are wide. By splitting they
+    // are kept to a unit or so for strokes, whose two sides must not seem to cross.
     bool exact = false;
 
 private:

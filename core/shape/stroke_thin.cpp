@@ -4,8 +4,8 @@
 namespace {
 constexpr int kMaxLevel = 5; // of halving one curve
 
-// The quarter of the circle that a way leads into.
-enum ESector { kRight, kDown, kLeft, kUp };
+// Which way a line leads: along the rows, or down or up them and to which side.
+enum ESector { kRight, kLeft, kDownRight, kDownLeft, kUpRight, kUpLeft };
 
 ESector SectorOf(const SPOINT& from, const SPOINT& to)
 {
@@ -13,85 +13,79 @@ ESector SectorOf(const SPOINT& from, const SPOINT& to)
     const S64 dy = S64{to.y} - from.y;
     if ((dx < 0 ? -dx : dx) >= (dy < 0 ? -dy : dy))
         return dx < 0 ? kLeft : kRight;
-    return dy < 0 ? kUp : kDown;
+    if (dy > 0)
+        return dx < 0 ? kDownLeft : kDownRight;
+    return dx > 0 ? kUpRight : kUpLeft;
 }
 
-// Where the two sides of an outline lie. A way across has one pixel in every column, a way along
-// the rows one in every row. What slopes lies half a row lower than its edges, because the raster
-// takes their crossings at the top of a row; so only a level way has its pixels below it.
+// Where the two sides of an outline lie: a line along the rows has one pixel in every column, any
+// other one in every row. Its first and its last pixel are among the four that meet at its end, so
+// that the pixels of neighbouring lines touch. The raster takes crossings at the top of a row
+// and in the middle of a column, and that is why a slope decides between the pixels on one side of
+// the points and on the other.
 struct SSides {
     SPOINT left, right;
 };
 
 SSides SidesOf(ESector sector, bool level)
 {
-    if (sector == kDown)
-        return {{1, 0}, {0, 0}};
-    if (sector == kUp)
-        return {{0, 0}, {1, 0}};
     const SPOINT upper = {0, level ? 0 : -1};
     const SPOINT lower = {0, level ? 1 : 0};
-    return sector == kRight ? SSides{upper, lower} : SSides{lower, upper};
+    switch (sector) {
+    case kRight:
+        return {upper, lower};
+    case kLeft:
+        return {lower, upper};
+    case kDownRight:
+        return {{1, 0}, {0, 0}};
+    case kDownLeft:
+        return {{0, 0}, {-1, 0}};
+    case kUpRight:
+        return {{-1, 0}, {0, 0}};
+    default:
+        return {{0, 0}, {1, 0}};
+    }
 }
 
-SPOINT Moved(const SPOINT& p, const SPOINT& by)
+SStrokePoint Moved(const SPOINT& p, const SPOINT& by)
 {
-    return {Saturate32(S64{p.x} + by.x), Saturate32(S64{p.y} + by.y)};
-}
-
-CURVE Moved(const CURVE& c, const SPOINT& by)
-{
-    return {Moved(c.anchor1, by), Moved(c.control, by), Moved(c.anchor2, by), c.isLine};
-}
-
-bool SamePoint(const SPOINT& a, const SPOINT& b)
-{
-    return a.x == b.x && a.y == b.y;
+    return FinePoint(p) + FinePoint(by);
 }
 } // namespace
 
 void SStroker::StrokeThinLine(const CURVE* c)
 {
-    StrokeThinPiece(*c, SectorOf(c->anchor1, c->anchor2));
-}
-
-void SStroker::StrokeThinPiece(const CURVE& c, int sector)
-{
-    const bool level = c.isLine && c.anchor1.y == c.anchor2.y;
-    const SSides sides = SidesOf(ESector(sector), level);
-    const CURVE left = Moved(c, sides.left);
-    CURVE right = Moved(c, sides.right);
-    Connect({{}, {}, FinePoint(left.anchor1), FinePoint(right.anchor1), 0});
-    last = {{}, {}, FinePoint(left.anchor2), FinePoint(right.anchor2), 0};
-    CurveReverse(&right, &right);
-    AddCurve(&left);
-    AddCurve(&right);
+    const bool level = c->anchor1.y == c->anchor2.y;
+    const SSides sides = SidesOf(SectorOf(c->anchor1, c->anchor2), level);
+    const SStrokeEnd start = {
+        {}, {}, Moved(c->anchor1, sides.left), Moved(c->anchor1, sides.right), 0};
+    Connect(start);
+    last = {{}, {}, Moved(c->anchor2, sides.left), Moved(c->anchor2, sides.right), 0};
+    AddEdge(start.left, last.left);
+    AddEdge(last.right, start.right);
 }
 
 void SStroker::StrokeThinCurve(const CURVE* c)
 {
-    StrokeThinBend(*c, 0);
+    StrokeThinBend({FinePoint(c->anchor1), FinePoint(c->control), FinePoint(c->anchor2), {}, {}},
+                   0);
 }
 
-// A curve whose ends lead into one quarter stays in it all the way.
-void SStroker::StrokeThinBend(const CURVE& c, int level)
+// Curves become lines, whose crossings are exact: at this width a step astray would be a gap.
+void SStroker::StrokeThinBend(const SBend& b, int level)
 {
-    const bool start = SamePoint(c.anchor1, c.control);
-    const bool end = SamePoint(c.control, c.anchor2);
-    if (start && end)
-        return;
-    const ESector sector = SectorOf(c.anchor1, start ? c.anchor2 : c.control);
-    if (sector == SectorOf(end ? c.anchor1 : c.control, c.anchor2)) {
-        StrokeThinPiece(c, sector);
+    if (level < kMaxLevel && !IsNearlyStraight(b)) {
+        const SStrokePoint p = FineMiddle(b.p1, b.control);
+        const SStrokePoint q = FineMiddle(b.control, b.p2);
+        const SStrokePoint m = FineMiddle(p, q);
+        StrokeThinBend({b.p1, p, m, {}, {}}, level + 1);
+        StrokeThinBend({m, q, b.p2, {}, {}}, level + 1);
         return;
     }
-    CURVE one, two;
-    if (level < kMaxLevel) {
-        CurveDivide(&c, &one, &two);
-        StrokeThinBend(one, level + 1);
-        StrokeThinBend(two, level + 1);
-    } else if (!SamePoint(c.anchor1, c.anchor2)) {
-        CurveSetLine(&c.anchor1, &c.anchor2, &one);
-        StrokeThinLine(&one);
-    }
+    CURVE line;
+    const SPOINT from = RasterPoint(b.p1);
+    const SPOINT to = RasterPoint(b.p2);
+    CurveSetLine(&from, &to, &line);
+    if (from.x != to.x || from.y != to.y)
+        StrokeThinLine(&line);
 }

@@ -71,7 +71,7 @@ SStroker::SStroker(DisplayList* display, REdge** list)
     : CEdgeCutter(display, list), antialias(display->raster.Antialias() != 0)
 {
     fillRule = kRuleWinding;
-    exact = true;
+    exact = antialias;
 }
 
 void SStroker::BeginStroke(S32 width, RColor* color)

@@ -51,8 +51,7 @@ private:
     static bool IsNearlyStraight(const SBend& b);
     static CURVE MovedSide(const SBend& b, const SStrokePoint& from, const SStrokePoint& to);
     void AddArc(const SStrokePoint& u, const SStrokePoint& v, const SStrokePoint& centre);
-    void StrokeThinPiece(const CURVE& c, int sector);
-    void StrokeThinBend(const CURVE& c, int level);
+    void StrokeThinBend(const SBend& b, int level);
 
     bool antialias; // coordinates are quarter pixels
     bool isOpen = false;
