@@ -11,6 +11,9 @@
 
 namespace {
 
+constexpr int kMpegRepeats = 20;
+constexpr int kMpegFrames = 9; // of 1152 samples in the tests' file
+
 // The data over and over; enough points that every buffer is scaled.
 void AddChannel(CSoundMix* mix, U8 format, const std::vector<U8>& data, bool envelope)
 {
@@ -26,9 +29,6 @@ void AddChannel(CSoundMix* mix, U8 format, const std::vector<U8>& data, bool env
         abort();
     channel->Release();
 }
-
-constexpr int kMpegRepeats = 20;
-constexpr int kMpegFrames = 9; // of 1152 samples in the tests' file
 
 // A second of noise; as MPEG audio what the tests have.
 std::vector<U8> Data(U8 format)
