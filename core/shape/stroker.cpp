@@ -130,8 +130,8 @@ void SStroker::EndStroke()
 
 void SStroker::StrokeDot()
 {
-    const SPOINT corner = {lastPt.x - thickness / 2, lastPt.y - thickness / 2};
-    const SStrokePoint p = FinePoint(corner);
+    const S64 before = thickness / 2 * kStrokeOne;
+    const SStrokePoint p = FinePoint(lastPt) - SStrokePoint{before, before};
     const S64 side = thickness * kStrokeOne;
     if (!thick) {
         AddEdge({p.x, p.y + side}, p);
