@@ -1,5 +1,4 @@
 #include "core/player/player.h"
-#include "core/stream/tags.h"
 
 #include <cstdio>
 
@@ -7,13 +6,6 @@ namespace {
 
 constexpr S32 kCursorInterval = 400; // milliseconds between two looks at the cursor
 constexpr S32 kTimerShare = 10;      // timer periods in a frame
-
-// Whether a tag other than the end's is there to be run next.
-bool CanAdvance(const ScriptThread& timeline)
-{
-    STagWalker next(timeline, timeline.pos);
-    return !timeline.atEnd && next.GetTag(timeline.len) > kTagEnd;
-}
 
 } // namespace
 
@@ -63,8 +55,10 @@ void SPlayer::Suspend()
 {
     if (!running)
         return;
-    StopTimer();
+    if (!sharedTimer)
+        StopTimer();
     running = 0;
+    SilenceThreads();
 }
 
 void SPlayer::ClearScript()
@@ -73,8 +67,9 @@ void SPlayer::ClearScript()
     FreeLayers();
     RectSetEmpty(&zoomRect);
     loaded = 0;
-    ChooseCamera();
-    CheckUpdate();
+    if (hostCamera)
+        return;
+    SetCamera(2);
 }
 
 void SPlayer::SetVersionVariable(ScriptPlayer* movie)
@@ -82,36 +77,4 @@ void SPlayer::SetVersionVariable(ScriptPlayer* movie)
     char text[32];
     std::snprintf(text, sizeof text, "%s %s", "BeOS", "4.1013");
     movie->SetVariable("$version", text, 0);
-}
-
-void SPlayer::GotoFrame(S32 target)
-{
-    if (actionDepth > 0) {
-        Seek(target);
-        return;
-    }
-    scene.ResetBudget();
-    Seek(target);
-    DoActions();
-    CheckUpdate();
-}
-
-void SPlayer::GetMenuState(MenuStatus* status)
-{
-    const S32 movieLoaded = gotHeader && scriptErr == 0;
-    const S32 several = numFrames > 1;
-    const S32 beyondFirst = curFrame != 0;
-    const S32 zoomed = !RectIsEmpty(&zoomRect);
-    const S32 fixedScale = scaleMode == kScaleFixed;
-    *status = {};
-    status->canViewAll = status->canZoomIn = status->canZoomOut = movieLoaded;
-    status->zoomed = zoomed;
-    status->canPlay = status->canLoop = several;
-    status->canRewind = status->canBack = beyondFirst;
-    status->canForward = CanAdvance(*this);
-    status->view100 = fixedScale;
-    status->viewAll = !zoomed && !fixedScale;
-    status->highQuality = highQuality;
-    status->looping = loop;
-    status->playing = playing;
 }

@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/display/display_list.h"
+#include "core/player/menu_status.h"
 #include "core/raster/bit_buffer.h"
 #include "core/stream/script_player.h"
 
@@ -18,27 +19,19 @@ constexpr S32 ClockElapsed(S32 now, S32 then)
     return (now - then) & 0x7FFFFFF;
 }
 
-// What a shell's menus show; each 0 or 1.
-struct MenuStatus {
-    S32 canViewAll, canZoomIn, canZoomOut; // a movie is loaded
-    S32 zoomed;
-    S32 canPlay;    // more than one frame
-    S32 canRewind;  // not at the first frame
-    S32 canForward; // the root timeline can advance
-    S32 canBack;    // not at the first frame
-    S32 canLoop;    // more than one frame
-    S32 view100;
-    S32 viewAll;
-    S32 highQuality;
-    S32 looping;
-    S32 playing;
-};
-
 // A shell subclasses this as NativePlayerWnd and calls everything from one thread. Virtual
 // operations are what the core asks of the shell; none may call back into the player unless its
 // contract says so. The shell's destructor calls ClearScript, while its operations still exist.
 class SPlayer : public ScriptPlayer {
 public:
+    // Added to a scale mode: Control100 shows the movie's top left corner, by a zoom.
+    static constexpr S32 kScaleTopLeft100 = 0x1000;
+    static constexpr S32 kFontLayer = 16000; // layer number of fontPlayer
+    // Factors of ZoomF.
+    static constexpr S32 kZoomIn = 0x8000;
+    static constexpr S32 kZoomOut = 0x20000;
+    enum FontState { kFontsUntried = 0, kFontsLoaded = 1, kFontsUnavailable = 2 };
+
     DisplayList scene;              // the display list; `display` of every thread points here
     ScriptPlayer* layers = nullptr; // levels 1 and up, through nextLayer, newest first
     CBitBuffer bits;                // the screen bitmap ...
@@ -50,14 +43,24 @@ public:
     int slowTicks = 0;
     int fastTicks = 0;
     int sampledTicks = 0;
-    S32 scaleMode = 0;     // SScaleMode bits; 0x1000 selects the top-left view of Control100
-    SRECT zoomRect;        // twips shown when zoomed; empty when not
-    int actionDepth = 0;   // above 0 while actions run
-    S32 nextFrameTime = 0; // clock value at which the next frame is due
-    int loaded = 0;        // the first frame can be shown
-    int running = 0;       // the shell's timer runs
-    S32 startTime = 0;     // clock value at construction
-    SRECT screenDirty;     // pixels that are to be copied to the screen
+    S32 scaleMode = 0;       // SScaleMode bits and kScaleTopLeft100
+    SRECT zoomRect;          // twips shown when zoomed; empty when not
+    ScriptPlayer fontPlayer; // the movie of the built-in fonts, in no list of levels
+    FontState fontState = kFontsUntried;
+    int actionDepth = 0;             // above 0 while actions run
+    S32 nextFrameTime = 0;           // clock value at which the next frame is due
+    int loaded = 0;                  // the first frame can be shown
+    int running = 0;                 // the shell's timer runs
+    int mouseState = -1;             // of the last mouse event: 0 up, 1 down; -1: not known
+    SPOINT mousePt = {};             // where it was, in pixels
+    S32 startTime = 0;               // clock value at construction
+    int firstLoad = 0;               // the next stream that opens is the movie of ControlOpen
+    SRECT screenDirty;               // pixels that are to be copied to the screen
+    MenuStatus menuMask = kAllMenus; // what the host allows; see SetMenuState
+
+    // --- set by a shell ---
+    int sharedTimer = 0; // the timer serves others too: Suspend leaves it running
+    int hostCamera = 0;  // the host sets the camera: ClearScript leaves it alone
 
     SPlayer();
     ~SPlayer() override;
@@ -82,17 +85,22 @@ public:
     virtual void CloseStream(StreamData* stream) = 0;
     // Passes a command to whatever contains the player.
     virtual void ProcessFSCommand(const char* command, const char* args) = 0;
+    // Brings menus up to date; after each control.
     virtual void EnableMenus(const MenuStatus& status) = 0;
     virtual void UpdateCursor() = 0;
     // Copies pixel rectangle `r` of the player's bits to the screen.
     virtual void BltToScreen(const SRECT* r) = 0;
     // Clears the screen: there are no bits to show.
     virtual void ClearScreen() = 0;
+    // The movie with the built-in fonts, allocated by malloc, which the core frees, and its length;
+    // 0 when there is none. Asked for once.
+    virtual void GetUnixFontData(U8** data, S32* size) = 0;
 
     // --- the tick ---
     // Advances every timeline by one frame if one is due (always, when `checkTime` is off) and
     // repaints.
     void DoPlay(int checkTime);
+    // Starts and stops the ticks; a stopped player is silent.
     void Run();
     void Suspend();
     // Runs the queued actions.
@@ -118,31 +126,93 @@ public:
     void CheckUpdate();
     // Repaints pixel rectangle `r`, with all else that changed.
     void Repaint(const SRECT* r);
-    // The shell's redraw.
-    void OnDraw();
+    // The shell's redraw: copies what the screen lacks, and pixel rectangle `exposed` in any case.
+    void OnDraw(const SRECT* exposed = nullptr);
     // Frees the screen bitmap, which the next paint makes anew.
     void FreeBuffer();
     // The same with other pixels from then on. A palette must live until the next call.
     void SetScreenFormat(const CScreenFormat& format);
 
     // --- view ---
-    void GotoFrame(S32 frame);
     // Recomputes the camera; then 1: UpdateScreen, 2: CheckUpdate, 0: nothing.
     void SetCamera(int update);
+    // No zoom.
     void Home();
+    // Shows a rectangle of the movie (twips); without width or height, the whole movie again.
     void SetZoomRect(S32 xmin, S32 ymin, S32 xmax, S32 ymax);
+    // Shows `factor` (16.16) times the width and height shown now, around pixel `devicePoint`, or
+    // around the present middle when that is null. Stays within the frame; from the whole frame on
+    // it is Home.
+    void ZoomF(S32 factor, const SPOINT* devicePoint);
+    // The same by the size and the middle of what is to be shown, in twips.
+    void Zoom(SPOINT size, SPOINT centre);
+    // Magnifies the present view by that many percent; 100 and nonsense are Home.
+    void ZoomScale(S32 percent);
+    // Moves a zoomed view over the movie by so many pixels, up to the frame's sides.
+    void Pan(S32 dx, S32 dy);
+    bool IsZoomed() const { return !RectIsEmpty(&zoomRect); }
     // Quality as scripts and command lines count it: 0 low, 1 high, 2 best.
     void SetQuality(int level);
+
+    // --- controls; each brings the menus up to date ---
+    // Unloads everything and asks for the movie at `url`, which is not the unloaded movie's own
+    // string. Nothing for an empty one.
+    void ControlOpen(const char* url);
+    void ControlClose();
+    // Stops or plays on.
+    void ControlPlay();
+    void ControlRewind();
+    void ControlForward();
+    void ControlBack();
+    void ControlLoop();
+    void ControlHighQuality();
+    void ControlViewAll();
+    void Control100();
+    void ControlZoomIn();
+    void ControlZoomOut();
+    // Zooms in around a pixel.
+    void ControlZoomContext(S32 x, S32 y);
+    // Stops the root timeline at a frame (from 0) and shows it, unless actions are running: they
+    // will.
+    void GotoFrame(S32 frame);
+
+    // --- menus ---
     void GetMenuState(MenuStatus* status);
+    void GetPopupMenuState(MenuStatus* status);
+    void GetEditMenuState(MenuStatus* status);
+    // From now on GetMenuState gives only what is allowed here too.
+    void SetMenuState(const MenuStatus& mask);
+
+    // --- fonts ---
+    // Has the built-in fonts defined in fontPlayer; false when there are none. Tried once.
+    bool LoadBuiltInFonts();
 
 private:
-    void AdvanceThreads();
+    // How many frames a tick plays, and which timeline's sound says so; null: the clock does.
+    struct SoundPace {
+        const ScriptThread* thread;
+        S32 frames;
+    };
+
+    SoundPace PaceOfSound() const;
+    bool WaitsForSound(const ScriptThread* thread) const;
+    void SilenceThreads();
+    void AdvanceThreads(const ScriptThread* pace);
+    void RetestButtons();
     void AdjustQuality(S32 elapsed, S32 framesPlayed);
     ScriptPlayer* NewLayer(S32 layer);
     bool CreateBits(const SRECT* client);
     void TakeDirty();
     void BlitPending();
     void ChooseCamera();
+    void PixelCamera(MATRIX* mat) const;
+    void LeaveFixedScale();
+    void TopLeftView(SRECT* r);
+    bool ShowsAt100();
+    void RequestMovie(const char* url);
+    void OfferWindow();
+    void RefreshMenus();
+    void RunFontMovie(const U8* data, S32 size);
 };
 
 // The level of that number among `first` and those linked behind it, or null.

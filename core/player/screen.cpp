@@ -24,8 +24,14 @@ bool SPlayer::CreateBits(const SRECT* client)
     if (width > CBitBuffer::kMaxSide || height > CBitBuffer::kMaxSide ||
         width * height > gLimits.surfacePixels)
         return false;
-    if (!bits.CreateScreenBits(static_cast<S32>(width), static_cast<S32>(height), screenFormat))
-        return false;
+    const S32 w = static_cast<S32>(width), h = static_cast<S32>(height);
+    if (!bits.CreateScreenBits(w, h, screenFormat)) {
+        // Memory is short: what can be made again goes before the screen does.
+        scene.FreeCache();
+        FreeCache();
+        if (!bits.CreateScreenBits(w, h, screenFormat))
+            return false;
+    }
     ChooseCamera();
     scene.ModifyCamera();
     InvalidateScreenArea(client);
@@ -90,9 +96,12 @@ void SPlayer::Repaint(const SRECT* r)
     BlitPending();
 }
 
-void SPlayer::OnDraw()
+// The pixels of the exposed area are right as they are; only the screen has lost them.
+void SPlayer::OnDraw(const SRECT* exposed)
 {
     UpdateBuffer(1);
+    if (exposed != nullptr)
+        RectUnion(&screenDirty, exposed, &screenDirty);
     BlitPending();
 }
 

@@ -6,58 +6,49 @@ namespace {
 // Half of the clock's range: what lies less than that behind is due, the rest is yet to come.
 constexpr S32 kClockHalf = 0x4000000;
 
-// Samples before the automatic quality decides at all, and ticks between two of its switches.
-constexpr int kLeastSamples = 5;
-constexpr int kLeastHold = 11;
-
 } // namespace
 
+// When a stream sets the pace, the picture waits for it or catches up, and the clock has no say.
 void SPlayer::DoPlay(int checkTime)
 {
     if (!loaded || actionDepth > 0)
         return;
     const S32 now = PlayerClock();
-    if (checkTime && ClockElapsed(now, nextFrameTime) >= kClockHalf)
+    const SoundPace pace = PaceOfSound();
+    if (pace.frames < 1)
+        return;
+    if (pace.thread == nullptr && checkTime && ClockElapsed(now, nextFrameTime) >= kClockHalf)
         return;
     nextFrameTime = now + frameDelay;
     scene.ResetBudget();
-    AdvanceThreads();
-    DoActions();
+    for (S32 i = 0; i < pace.frames; i++) {
+        AdvanceThreads(pace.thread);
+        DoActions();
+    }
+    RetestButtons();
     UpdateScreen();
     if (autoQuality)
-        AdjustQuality(ClockElapsed(PlayerClock(), now), 1);
+        AdjustQuality(ClockElapsed(PlayerClock(), now), pace.frames);
 }
 
 // Newest first: sprites come before their parents. A timeline that starts during the walk goes to
-// the front of the list, behind the cursor, and waits for the next tick.
-void SPlayer::AdvanceThreads()
+// the front of the list, behind the cursor, and waits for the next frame. `pace` is only compared:
+// it may be gone by now.
+void SPlayer::AdvanceThreads(const ScriptThread* pace)
 {
     scene.threadCursor = scene.threads;
     while (scene.threadCursor != nullptr) {
         ScriptThread* thread = scene.threadCursor;
         scene.threadCursor = thread->nextThread;
-        thread->DoFrame(1, false);
+        if (thread == pace || !WaitsForSound(thread))
+            thread->DoFrame(1, false);
     }
 }
 
 // The place where the queue of actions will be run; movies have none yet.
 void SPlayer::DoActions() {}
 
-// The counters are never reset: the rule works on all ticks since the movie was opened.
-void SPlayer::AdjustQuality(S32 elapsed, S32 framesPlayed)
-{
-    if (elapsed > frameDelay || framesPlayed >= 2)
-        slowTicks++;
-    else if (elapsed < frameDelay / 4)
-        fastTicks++;
-    sampledTicks++;
-    if (sampledTicks >= kLeastSamples && qualityHold >= kLeastHold) {
-        const int ticks = highQuality ? slowTicks : fastTicks;
-        if (3 * ticks > sampledTicks) {
-            highQuality = !highQuality;
-            qualityHold = 0;
-            SetCamera(2);
-        }
-    }
-    qualityHold++;
-}
+// The place where buttons that move under a pointer at rest will change their state: tested at
+// mousePt, once mouseState is known, unless a press or a drag holds the mouse. Movies have no
+// buttons yet.
+void SPlayer::RetestButtons() {}

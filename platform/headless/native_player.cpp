@@ -140,3 +140,9 @@ void NativePlayerWnd::ProcessFSCommand(const char*, const char*) {}
 void NativePlayerWnd::EnableMenus(const MenuStatus&) {}
 
 void NativePlayerWnd::UpdateCursor() {}
+
+void NativePlayerWnd::GetUnixFontData(U8** data, S32* size)
+{
+    *data = nullptr;
+    *size = 0;
+}

@@ -52,6 +52,7 @@ public:
     void ProcessFSCommand(const char* command, const char* args) override;
     void EnableMenus(const MenuStatus& status) override;
     void UpdateCursor() override;
+    void GetUnixFontData(U8** data, S32* size) override;
 
     SRECT blitted;     // union of what BltToScreen was asked to show since the caller emptied it
     SRECT invalidated; // the same for InvalidateScreenArea

@@ -25,8 +25,7 @@ TEST(Tick, PlaysOneFrameWheneverOneIsDue)
 
 TEST(Tick, TimerFiresTenTimesAFrame)
 {
-    const std::pair<U16, S32> cases[] = {
-        {Fps(12), 8}, {Fps(120), 0}, {1, 25600}, {0, 25600}, {0xFFFF, 0}};
+    const std::pair<U16, S32> cases[] = {{Fps(12), 8}, {Fps(120), 0}, {0, 25600}, {0xFFFF, 0}};
     for (const auto& [rate, interval] : cases)
         EXPECT_EQ(interval, PlayingShell(MovingSquare(3, rate)).TimerInterval()) << rate;
 }
@@ -79,10 +78,8 @@ TEST(Levels, AreMadeClearedAndLimited)
     EXPECT_EQ(&player, player.scene.threadCursor);
     EXPECT_EQ(two, player.layers);
     EXPECT_EQ(nullptr, player.OpenLayer(-1, 0));
-    player.SetZoomRect(0, 0, 9, 9);
     EXPECT_EQ(&player, player.OpenLayer(0, 0));
     EXPECT_FALSE(player.Started() || player.TimerRuns() || player.layers != nullptr);
-    EXPECT_TRUE(RectIsEmpty(&player.zoomRect));
     gLimits = {};
 }
 
@@ -164,31 +161,6 @@ TEST(Screen, SizeAndQualityDecide)
         EXPECT_EQ(c.animated, player.scene.animatedMovie) << c.width << "x" << c.height;
     }
     gLimits = {};
-}
-
-// A zoom waits while the scale is fixed.
-TEST(Screen, ZoomsAndComesHomeWithItsMenus)
-{
-    PlayingShell player(MovingSquare(3));
-    const MATRIX home = player.scene.camera;
-    player.SetZoomRect(0, 0, 1000, 800);
-    EXPECT_NEAR(2 * home.a, player.scene.camera.a, 2);
-    EXPECT_TRUE(RectIsEmpty(&player.blitted)) << "painting is left to the shell";
-    RectSetEmpty(&player.invalidated);
-    player.GotoFrame(2);
-    EXPECT_FALSE(RectIsEmpty(&player.invalidated));
-    MenuStatus menu;
-    player.GetMenuState(&menu);
-    EXPECT_TRUE(menu.zoomed && menu.canPlay && menu.canRewind && menu.canBack && menu.looping);
-    EXPECT_FALSE(menu.canForward || menu.viewAll || menu.view100 || menu.playing);
-    player.scaleMode = kScaleFixed;
-    player.SetCamera(0);
-    EXPECT_TRUE(MatrixEqual(&home, &player.scene.camera, 0));
-    player.Home();
-    EXPECT_TRUE(RectIsEmpty(&player.zoomRect));
-    EXPECT_EQ(kScaleFixed, player.scaleMode);
-    player.SetZoomRect(10, 0, 10, 800);
-    EXPECT_EQ(kScaleShowAll, player.scaleMode) << "no rectangle";
 }
 
 } // namespace
