@@ -122,8 +122,11 @@ TEST(Screen, PaintsAndCopiesWhatItMust)
         player.Repaint(&spoiled);
         EXPECT_TRUE(RectEqual(&around, &player.blitted, 2));
         EXPECT_EQ("", ExpectSame(Shot(&player), before, "repaint"));
-        player.Repaint(&beyond);
-        EXPECT_TRUE(RectEqual(&whole, &player.blitted, 0));
+        for (auto draw : {&SPlayer::Repaint, &SPlayer::OnDraw}) {
+            RectSetEmpty(&player.blitted);
+            (player.*draw)(&beyond);
+            EXPECT_TRUE(RectEqual(&whole, &player.blitted, 0));
+        }
         RectSetEmpty(&player.invalidated);
         player.FreeBuffer();
         player.UpdateScreen();
