@@ -97,8 +97,8 @@ public:
     virtual void GetUnixFontData(U8** data, S32* size) = 0;
 
     // --- the tick ---
-    // Advances every timeline by one frame if one is due (always, when `checkTime` is off) and
-    // repaints.
+    // Advances every timeline by one frame if one is due (always, when `checkTime` is off), or by
+    // as many as a streaming sound asks for, and repaints.
     void DoPlay(int checkTime);
     // Starts and stops the ticks; a stopped player is silent.
     void Run();
@@ -134,6 +134,9 @@ public:
     void SetScreenFormat(const CScreenFormat& format);
 
     // --- view ---
+    // Stops the root timeline at a frame (from 0) and has it shown; from within an action it only
+    // seeks.
+    void GotoFrame(S32 frame);
     // Recomputes the camera; then 1: UpdateScreen, 2: CheckUpdate, 0: nothing.
     void SetCamera(int update);
     // No zoom.
@@ -172,9 +175,6 @@ public:
     void ControlZoomOut();
     // Zooms in around a pixel.
     void ControlZoomContext(S32 x, S32 y);
-    // Stops the root timeline at a frame (from 0) and shows it, unless actions are running: they
-    // will.
-    void GotoFrame(S32 frame);
 
     // --- menus ---
     void GetMenuState(MenuStatus* status);
