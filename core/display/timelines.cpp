@@ -4,20 +4,13 @@
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
+#include "core/stream/movie_data.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 
 namespace {
 // tagEnd of a timeline that has read no tag yet.
 constexpr S32 kNoTagYet = 0x20000000;
-
-// Counts one more holder of a movie's bytes. False when there is no memory for the count.
-bool ShareScript(ScriptPlayer* movie)
-{
-    if (!movie->sharedScript)
-        movie->sharedScript = new (std::nothrow) S32(1);
-    return movie->sharedScript != nullptr;
-}
 
 void CopyHeader(const ScriptPlayer* from, ScriptPlayer* to)
 {
@@ -96,7 +89,7 @@ void DisplayList::StartLoadedMovie(SObject* obj, const PlaceInfo* info)
     ScriptPlayer* movie = clone ? CloneMovie(obj->character) : obj->character->player;
     if (clone && obj->character->privateCopy)
         obj->character->player = movie; // the source may be gone when this clone is cloned
-    if (!movie || movie->rootObject || (!clone && !ShareScript(movie)))
+    if (!movie || movie->rootObject)
         return;
     RestartTimeline(movie);
     AttachTimeline(obj, movie);
@@ -108,15 +101,14 @@ void DisplayList::StartLoadedMovie(SObject* obj, const PlaceInfo* info)
 ScriptPlayer* DisplayList::CloneMovie(const SCharacter* character)
 {
     ScriptPlayer* source = character->player;
-    if (!source || !source->Complete() || clonedMovies >= gLimits.loadedMovies ||
-        !ShareScript(source))
+    if (!source || !source->Complete() || clonedMovies >= gLimits.loadedMovies)
         return nullptr;
     auto* copy = new (std::nothrow) ScriptPlayer;
     if (!copy)
         return nullptr;
     CopyHeader(source, copy);
     copy->sharedScript = source->sharedScript;
-    ++*copy->sharedScript;
+    copy->sharedScript->AddRef();
     copy->sharedCopy = true;
     clonedMovies++;
     return copy;

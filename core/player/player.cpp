@@ -22,6 +22,7 @@ SPlayer::SPlayer()
     RectSetEmpty(&screenDirty);
     scene.AddThread(this);
     scene.SetBits(&bits);
+    scene.soundMix = theSoundMix;
     startTime = PlayerClock();
     SetVersionVariable(this);
 }

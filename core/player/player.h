@@ -59,8 +59,13 @@ public:
     MenuStatus menuMask = kAllMenus; // what the host allows; see SetMenuState
 
     // --- set by a shell ---
-    int sharedTimer = 0; // the timer serves others too: Suspend leaves it running
-    int hostCamera = 0;  // the host sets the camera: ClearScript leaves it alone
+    // The mixer of the process, made before its first player and gone after its last; null: no
+    // sound, and the clock alone paces.
+    static CSoundMix* theSoundMix;
+    int soundOn = 1;         // sounds are started
+    S32 soundBufferTime = 5; // seconds of lead that a streaming sound wants when data runs out
+    int sharedTimer = 0;     // the timer serves others too: Suspend leaves it running
+    int hostCamera = 0;      // the host sets the camera: ClearScript leaves it alone
 
     SPlayer();
     ~SPlayer() override;
@@ -197,6 +202,7 @@ private:
     SoundPace PaceOfSound() const;
     bool WaitsForSound(const ScriptThread* thread) const;
     void SilenceThreads();
+    void TendSounds();
     void AdvanceThreads(const ScriptThread* pace);
     void RetestButtons();
     void AdjustQuality(S32 elapsed, S32 framesPlayed);

@@ -1,30 +1,38 @@
-// The sound's part in the tick: a timeline with a streaming sound waits for what is heard, or
-// catches up with it.
+// The sound's part in the tick: what the mixer needs done, and timelines with a streaming sound,
+// which wait for what is heard, or catch up with it.
 #include "core/player/limits.h"
 #include "core/player/player.h"
-#include "core/sound/sound_channel.h"
+#include "core/sound/sound_mix.h"
 
 #include <algorithm>
 
 namespace {
-
-// The streaming sound of a timeline, while it goes on and its samples count; null when there is
-// none. Timelines have none yet.
-const CSoundChannel* ActiveStream(const ScriptThread*)
-{
-    return nullptr;
+constexpr S32 kMostIdle = 43; // buffers without a sound after which the device is closed: 2 s
 }
 
-} // namespace
+CSoundMix* SPlayer::theSoundMix = nullptr;
 
-// The newest timeline with a stream decides, whichever movie it belongs to.
+// Also in ticks that hold the picture: what is made ready here is heard meanwhile.
+void SPlayer::TendSounds()
+{
+    if (!scene.soundMix)
+        return;
+    for (ScriptThread* thread = scene.threads; thread; thread = thread->nextThread)
+        thread->TendStream();
+    scene.soundMix->PurgeList();
+    if (scene.soundMix->IdleCount() > kMostIdle)
+        scene.soundMix->CloseDevice();
+}
+
+// The newest timeline with a stream decides, whichever movie it belongs to. A stream that waits for
+// data decides nothing: the others must not wait with it.
 SPlayer::SoundPace SPlayer::PaceOfSound() const
 {
     for (const ScriptThread* thread = scene.threads; thread; thread = thread->nextThread) {
-        const CSoundChannel* sound = ActiveStream(thread);
-        if (sound == nullptr)
+        if (!thread->StreamPlays() || thread->streamChannel->Waiting())
             continue;
-        const S64 ahead = static_cast<S64>(sound->ElapsedFrames()) - thread->curFrame;
+        const S64 ahead =
+            static_cast<S64>(thread->streamChannel->ElapsedFrames()) - thread->curFrame;
         return {thread, static_cast<S32>(std::min<S64>(ahead, gLimits.framesPerTick))};
     }
     return {nullptr, 1};
@@ -33,9 +41,11 @@ SPlayer::SoundPace SPlayer::PaceOfSound() const
 // A timeline that does not set the pace waits while it is ahead of its own sound.
 bool SPlayer::WaitsForSound(const ScriptThread* thread) const
 {
-    const CSoundChannel* sound = ActiveStream(thread);
-    return sound != nullptr && !sound->StreamEnded() && sound->ElapsedFrames() < thread->curFrame;
+    return thread->StreamPlays() && thread->streamChannel->ElapsedFrames() < thread->curFrame;
 }
 
-// The place where every timeline's stream ends and its sounds are taken from the mixer.
-void SPlayer::SilenceThreads() {}
+void SPlayer::SilenceThreads()
+{
+    for (ScriptThread* thread = scene.threads; thread; thread = thread->nextThread)
+        thread->Silence();
+}

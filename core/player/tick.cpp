@@ -14,6 +14,7 @@ void SPlayer::DoPlay(int checkTime)
     if (!loaded || actionDepth > 0)
         return;
     const S32 now = PlayerClock();
+    TendSounds();
     const SoundPace pace = PaceOfSound();
     if (pace.frames < 1)
         return;

@@ -116,7 +116,7 @@ S32 CSoundChannel::ElapsedFrames() const
         return 0;
     const U64 pair = published.load(std::memory_order_acquire);
     S64 samples = S64(pair >> kClockBits);
-    if (!doNotCount && mixer) {
+    if (!doNotCount && !Waiting() && mixer) {
         const U64 since = (U64(mixer->Clock()) - pair) & kClockMask;
         samples +=
             (std::min<S64>(S64(since), kLongest) * kSamplesPerMs) >> SoundRateShift(sound.format);
@@ -155,7 +155,7 @@ void CSoundChannel::FillStream(U8* out, S32 frames, S32 index)
         to = to ? to + n * SoundFrameBytes(sound.format) : nullptr;
         blockLeft -= n;
         frames -= n;
-        if (!doNotCount)
+        if (!doNotCount && !(silent && Waiting()))
             counts[index] += n;
     }
     FadeIn(out, whole);

@@ -71,6 +71,8 @@ public:
     S32 blockLeft = 0;                    // frames left in the block
     S16 silenceCount = 0; // frames of silence due before the next block; the sign is the reader's
     bool fadeIn = false;  // the next buffer rises from silence
+    // Whether the stream waits for what it is to bring: its silence then does not count as heard.
+    void SetWaiting(bool on) { waiting.store(on, std::memory_order_release); }
 
     // --- any thread ---
     void AddRef() { references.fetch_add(1, std::memory_order_relaxed); }
@@ -80,8 +82,10 @@ public:
     void Stop() { removed.store(true, std::memory_order_relaxed); }
     bool Removed() const { return removed.load(std::memory_order_relaxed); }
     bool StreamEnded() const { return ended.load(std::memory_order_acquire); }
+    bool Waiting() const { return waiting.load(std::memory_order_acquire); }
     // How many of the stream's picture frames have been heard: rounded, so a frame counts from its
-    // middle on, and carried on by the clock for up to 63 ms after a buffer was completed.
+    // middle on, and carried on by the clock for up to 63 ms after a buffer was completed, unless
+    // the stream waits.
     S32 ElapsedFrames() const;
 
 private:
@@ -112,15 +116,16 @@ private:
 
     std::atomic<S32> references{1};
     std::atomic<bool> removed{false};
-    std::atomic<bool> ended{false};  // the stream brings nothing more
-    std::atomic<U64> published{0};   // samples heard << 27 | time of the last completed buffer, ms
-    CSoundHolder* owner = nullptr;   // of the bytes
-    CSoundMix* mixer = nullptr;      // set while it plays and after
-    CSoundChannel* next = nullptr;   // in the mixer's list, then in that of the purged
-    S32 counts[kMostSoundBuffers]{}; // frames that each output buffer will count when complete
-    bool silent = false;             // the stream's block is silence
-    U64 envelopePosition = 0;        // samples at 44100 Hz
-    S32 position = 0;                // frames at the sound's rate, like the next four
+    std::atomic<bool> ended{false};   // the stream brings nothing more
+    std::atomic<bool> waiting{false}; // the stream brings nothing for now
+    std::atomic<U64> published{0};    // samples heard << 27 | time of the last completed buffer, ms
+    CSoundHolder* owner = nullptr;    // of the bytes
+    CSoundMix* mixer = nullptr;       // set while it plays and after
+    CSoundChannel* next = nullptr;    // in the mixer's list, then in that of the purged
+    S32 counts[kMostSoundBuffers]{};  // frames that each output buffer will count when complete
+    bool silent = false;              // the stream's block is silence
+    U64 envelopePosition = 0;         // samples at 44100 Hz
+    S32 position = 0;                 // frames at the sound's rate, like the next four
     S32 start = 0;
     S32 end = 0;
     S32 passLeft = 0;  // still to be passed over before the first frame is heard

@@ -46,8 +46,8 @@ struct SFontPart {
 };
 
 struct SSoundPart {
-    U8 format;       // format byte: compression, rate, size, channels
-    U32 sampleCount; // as declared: never trusted for memory
+    U8 format;       // SSoundFormat bits
+    U32 sampleCount; // as declared, up to 2^31 - 1: never trusted for memory
     S16 start;       // MPEG: lead-in samples to pass over
     S32 dataLen;     // bytes of sound data at `data`
 };

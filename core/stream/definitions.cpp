@@ -3,17 +3,10 @@
 #include "core/display/display_list.h"
 #include "core/stream/script_player.h"
 #include "core/stream/script_thread.h"
+#include "core/stream/sounds.h"
 #include "core/stream/tags.h"
 
 namespace {
-// Sound compressions, the high nibble of the format byte.
-enum SSoundCompression : U8 {
-    kSoundPlain = 0x00,
-    kSoundAdpcm = 0x10,
-    kSoundMpeg = 0x20,
-    kSoundPlainLittle = 0x30,
-};
-
 constexpr U16 kEditOwnGlyphs = 0x0100; // drawn with the movie's font, not with a device font
 } // namespace
 
@@ -178,21 +171,14 @@ void ScriptThread::DefineSound()
     SCharacter* ch = NewCharacter(kCharSound);
     if (!ch)
         return;
-    const U16 id = ch->tag;
-    ch->sound.format = GetByte();
-    ch->sound.sampleCount = GetDWord();
-    switch (ch->sound.format & 0xF0) {
-    case kSoundPlain:
-    case kSoundAdpcm:
-    case kSoundPlainLittle:
-        break;
-    case kSoundMpeg:
-        ch->sound.start = static_cast<S16>(GetWord());
-        break;
-    default:
-        player->FreeCharacter(id); // a compression that nobody can play: the id stays free
+    CSound sound;
+    if (!GetSoundBody(this, &sound)) {
+        player->FreeCharacter(ch->tag); // a compression that nobody can play: the id stays free
         return;
     }
+    ch->sound.format = sound.format;
+    ch->sound.sampleCount = static_cast<U32>(sound.numSamples);
+    ch->sound.start = static_cast<S16>(sound.start);
     KeepBody(ch);
     ch->sound.dataLen = ch->dataLen;
 }

@@ -3,7 +3,9 @@
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
+#include "core/sound/sound_mix.h"
 #include "core/stream/script_player.h"
+#include "core/stream/sounds.h"
 
 namespace {
 U64 allPixels = 0; // decoded, of all movies
@@ -89,11 +91,21 @@ void ScriptPlayer::FreeCharacter(U16 id)
 
 void ScriptPlayer::FreeCharacter(SCharacter* ch)
 {
+    StopPlaying(ch);
     if (ch->users == 0) {
         DestroyCharacter(ch);
         return;
     }
     ch->orphan = true;
+}
+
+// A sound that leaves the dictionary falls silent.
+void ScriptPlayer::StopPlaying(const SCharacter* ch)
+{
+    CSound sound;
+    CSoundMix* mix = Mixer();
+    if (mix && SoundOf(ch, &sound))
+        mix->FreeSound(&sound);
 }
 
 void ScriptPlayer::DestroyCharacter(SCharacter* ch)

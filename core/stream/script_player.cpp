@@ -2,13 +2,12 @@
 #include "core/stream/script_player.h"
 
 #include <cstdint>
-#include <cstdlib>
 #include <cstring>
-#include <new>
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
 #include "core/player/player.h"
+#include "core/stream/movie_data.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
 
@@ -19,12 +18,6 @@ constexpr S32 kHeaderBytes = 8;
 constexpr S32 kHeaderThreshold = 20;
 constexpr int kCharactersPerBlock = 32;
 constexpr U32 kCharacterMark = 0x33333333;
-
-// The movie's bytes belong to the loader; only readers see them as constant.
-U8* Writable(const U8* script)
-{
-    return const_cast<U8*>(script);
-}
 
 S32 Min(S32 a, S32 b)
 {
@@ -54,12 +47,13 @@ void ScriptPlayer::PushDataBuf(const U8* data, S32 n)
     if (scriptLen < 0 && !CollectHeader(data, n))
         return;
     const S32 count = Min(n, scriptLen - len);
-    std::memcpy(Writable(script) + len, data, static_cast<size_t>(count));
+    std::memcpy(sharedScript->Bytes() + len, data, static_cast<size_t>(count));
     len += count;
     if (!gotHeader && len > kHeaderThreshold)
         ParseHeader();
     if (gotHeader)
         CountCompleteFrames();
+    sharedScript->Publish(len, numFramesComplete);
 }
 
 // Takes the first bytes of the movie off the block, and makes the buffer when all 8 are there;
@@ -90,12 +84,12 @@ S32 ScriptPlayer::StartMovie()
         return kErrBadHeader;
     if (declared > gLimits.movieBytes)
         return kErrNoMemory;
-    auto* buffer = static_cast<U8*>(std::calloc(size_t{declared} + 1, 1));
-    if (!buffer)
+    sharedScript = MovieData::Create(static_cast<S32>(declared));
+    if (!sharedScript)
         return kErrNoMemory;
-    std::memcpy(buffer, header, kHeaderBytes);
+    std::memcpy(sharedScript->Bytes(), header, kHeaderBytes);
     scriptLen = static_cast<S32>(declared);
-    Attach(buffer, scriptLen, kHeaderBytes);
+    Attach(sharedScript->Bytes(), scriptLen, kHeaderBytes);
     len = kHeaderBytes;
     return kErrNone;
 }
@@ -165,14 +159,19 @@ void ScriptPlayer::PushDataComplete()
     splayer->SetCamera(2);
 }
 
-// A movie needs nothing more at the end of its stream: what is missing stays missing.
-void ScriptPlayer::SetDataComplete() {}
+// What is missing stays missing; a streaming sound that waits for it must know.
+void ScriptPlayer::SetDataComplete()
+{
+    if (sharedScript)
+        sharedScript->Close();
+}
 
 void ScriptPlayer::ClearScript()
 {
     if (stream && splayer)
         splayer->CloseStream(stream);
     stream = nullptr;
+    Silence();
     FreeAll();
     ReleaseBuffer();
     ClearState();
@@ -185,14 +184,11 @@ void ScriptPlayer::ClearScript()
     startPos = 0;
 }
 
-// Lets go of the bytes; those that other loaders share are freed by the last of them.
+// Lets go of the bytes; the last of their holders frees them.
 void ScriptPlayer::ReleaseBuffer()
 {
-    const bool last = !sharedScript || --*sharedScript == 0;
-    if (last) {
-        delete sharedScript;
-        std::free(Writable(script));
-    }
+    if (sharedScript)
+        sharedScript->Release();
     sharedScript = nullptr;
     if (sharedCopy && display)
         display->clonedMovies--;

@@ -8,6 +8,7 @@
 #include "core/stream/character.h"
 #include "core/stream/script_thread.h"
 
+class MovieData;
 struct StreamData;
 
 // Errors kept in scriptErr; final until ClearScript.
@@ -29,7 +30,7 @@ public:
     ScriptPlayer* nextLayer = nullptr; // link of the player's levels
     char* sourceName = nullptr;        // owned; where the movie came from
     S32 scriptLen = -1;                // declared length; -1 while the header has not arrived
-    S32* sharedScript = nullptr;       // holders of the buffer when loaders share it; made by new
+    MovieData* sharedScript = nullptr; // the bytes, counted; null while there are none
     S32 headerBytes = 0;               // of the first 8 bytes, how many have arrived
     U8 header[8] = {};
     bool gotHeader = false;     // frame rectangle, rate and count are known
@@ -112,6 +113,7 @@ private:
     void PushVariables(const U8* data, S32 n);
     bool IndexCharacter(U16 id, SCharacter* ch);
     void FreeIdPages();
+    void StopPlaying(const SCharacter* ch);
     void DestroyCharacter(SCharacter* ch);
     bool HasRoomFor(U64 pixels) const;
     void DropUnusedPixels();

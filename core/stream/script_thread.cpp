@@ -1,6 +1,7 @@
 #include "core/stream/script_thread.h"
 
 #include <algorithm>
+#include <atomic>
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
@@ -13,15 +14,18 @@ namespace {
 // tag that is only passed over is several.
 constexpr U32 kWorkPerTag = 64;
 constexpr int kWorkPerHeader = 4;
+
+std::atomic<U64> lastSoundTag{0};
 } // namespace
 
-ScriptThread::ScriptThread()
+ScriptThread::ScriptThread() : soundTag(++lastSoundTag)
 {
     ClearState();
 }
 
 ScriptThread::~ScriptThread()
 {
+    StopStream();
     if (display) {
         if (rootObject && rootObject->thread == this)
             rootObject->thread = nullptr;
@@ -32,6 +36,10 @@ ScriptThread::~ScriptThread()
 
 void ScriptThread::ClearState()
 {
+    StopStream();
+    streamStart = true;
+    streamFormat = 11;
+    streamSound.Init();
     Attach(nullptr, 0);
     len = 0;
     curFrame = -1;
@@ -119,6 +127,16 @@ void ScriptThread::Dispatch()
     case kTagRemoveObject:
     case kTagRemoveObject2:
         RemoveObject();
+        break;
+    case kTagStartSound:
+        StartSound();
+        break;
+    case kTagSoundStreamHead:
+    case kTagSoundStreamHead2:
+        SoundStreamHead();
+        break;
+    case kTagSoundStreamBlock:
+        SoundStreamBlock();
         break;
     default:
         DispatchDefinition();
@@ -248,11 +266,6 @@ void ScriptThread::Play(bool rewind)
     if (rewind && !loop && curFrame >= numFrames - 1)
         Seek(0);
     playing = true;
-}
-
-void ScriptThread::StopSound()
-{
-    streamStart = IsRoot();
 }
 
 S32 ScriptThread::FindLabel(const char* name)

@@ -2,12 +2,16 @@
 #pragma once
 
 #include "core/geom/types.h"
+#include "core/sound/sound.h"
 #include "core/stream/parser.h"
 
+class CSoundChannel;
+class CSoundMix;
 class DisplayList;
 struct PlaceInfo;
 class SPlayer;
 class ScriptPlayer;
+class StreamReader;
 struct SCharacter;
 struct SObject;
 
@@ -38,8 +42,7 @@ public:
     bool atEnd = false;         // the End tag has run
     S32 curFrame = -1;          // last frame whose ShowFrame has run
     bool seeking = false;       // tags run only to rebuild state: no actions, no sounds
-    bool soundResync = true;    // set by Play and by every seek, for the streaming sound
-    bool soundHold = false;     // the streaming sound's own
+    bool soundResync = true;    // set by Play and by every seek: a stream then fades in
     bool playing = true;        // advances on each tick
     bool loop = true;           // goes back to frame 0 at the end
     S32 numFrames = 0;
@@ -49,8 +52,12 @@ public:
     const char* label = nullptr;    // last FrameLabel seen, in the movie buffer
     DisplayList* display = nullptr; // where the timeline's objects are
     SObject* rootObject = nullptr;  // parent of everything that this timeline places
-    bool streamStart = true;        // playback of a root thread stopped or jumped, for the sound
-    SVariable* vars = nullptr;      // in order of creation
+    bool streamStart = true;        // a block may start the streaming sound
+    U8 streamFormat = 11;           // first byte of the stream head; kept, not used
+    CSound streamSound;             // what the stream head says
+    CSoundChannel* streamChannel = nullptr; // of the streaming sound, counted; null: none
+    const U64 soundTag;                     // of this timeline's sounds; never used again
+    SVariable* vars = nullptr;              // in order of creation
     SVariable* varsTail = nullptr;
 
     ScriptThread();
@@ -86,9 +93,9 @@ public:
     // Removes the sprite's object; with `keep` an empty sprite takes its place, transform and name.
     void RemoveSprite(ScriptThread* sprite, bool keep);
 
-    // Makes sure that the pixels of a bitmap exist, decoding its tag in the movie that owns it; false
-    // when there are none: no bitmap, no image in the tag, no room for it. That is remembered until
-    // the movie's FreeCache.
+    // Makes sure that the pixels of a bitmap exist, decoding its tag in the movie that owns it;
+    // false when there are none: no bitmap, no image in the tag, no room for it. That is remembered
+    // until the movie's FreeCache.
     static bool BuildBits(SCharacter* ch);
 
     // Back to a timeline without data that has not started.
@@ -103,12 +110,24 @@ public:
     SVariable* FindVariable(const char* name);
     void ClearVariables();
 
+    // Takes the streaming sound away; when it returns nothing reads for it any more.
+    void StopStream();
+    // The same, with all that the timeline has started.
+    void Silence();
+    // Once a tick: makes ready what the streaming sound is going to need.
+    void TendStream();
+    // A streaming sound goes on that this timeline keeps time with: not ended, counted, and a
+    // device plays it.
+    bool StreamPlays() const;
+
     // This thread is its movie's root timeline.
     bool IsRoot() const;
 
 protected:
     // Back to the first tag; what has been placed stays.
     void Rewind();
+    // The mixer; null: none, no sound.
+    CSoundMix* Mixer() const;
 
 private:
     bool HasBudget() const;
@@ -121,6 +140,9 @@ private:
     S32 SeekBack(S32 frame);
     void RunSilently(S32 frame);
     void StopSound();
+    CSoundMix* PlayingMixer() const;
+    bool StartStream(CSoundMix* mix);
+    StreamReader* NewReader(CSoundMix* mix);
 
     // tag handlers
     void PlaceObject();
@@ -142,6 +164,9 @@ private:
     void DefineFontInfo();
     void DefineButtonExtra();
     void FreeCharacter();
+    void StartSound();
+    void SoundStreamHead();
+    void SoundStreamBlock();
     // Reads the id and enters a character of that type; null (and the tag is ignored) when the id
     // is taken or reserved.
     SCharacter* NewCharacter(U8 type);
@@ -156,8 +181,9 @@ private:
     void AddToBucket(SVariable* var);
     bool GrowIndex();
 
-    U32 frameTags = 0;             // tags executed of this frame in this go
-    U32 workDone = 0;              // units of work not yet charged, less than a tag
+    StreamReader* streamReader = nullptr; // lives with streamChannel
+    U32 frameTags = 0;                    // tags executed of this frame in this go
+    U32 workDone = 0;                     // units of work not yet charged, less than a tag
     SVariable** buckets = nullptr; // name index, grown with the list; null while the list is short
     U32 bucketCount = 0;
     U32 variableCount = 0;

@@ -1,5 +1,6 @@
 // Movies as they arrive, and the dictionary that their definitions fill.
 #include "core/player/limits.h"
+#include "core/stream/movie_data.h"
 #include "tests/stream/stream_scene.h"
 
 #include <gtest/gtest.h>
@@ -120,11 +121,12 @@ TEST(Loader, UnusualHeaders)
     auto* first = new ScriptPlayer;
     Push(*first, bytes);
     ScriptPlayer second;
-    first->sharedScript = second.sharedScript = new S32(2);
+    second.sharedScript = first->sharedScript;
+    second.sharedScript->AddRef();
     second.Attach(first->script, first->limit);
     second.scriptLen = first->scriptLen;
     delete first;
-    EXPECT_TRUE(second.script[0] == 'M' && *second.sharedScript == 1);
+    EXPECT_EQ('M', second.script[0]);
 }
 
 // A movie whose tags have all run, without a display.
