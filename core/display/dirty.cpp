@@ -56,13 +56,21 @@ void DecomposeRect(SRECT* a, SRECT* b)
     }
 }
 
+void DisplayList::Grow(const SRECT* r, SRECT* dst) const
+{
+    *dst = *r;
+    if (!RectIsEmpty(r))
+        *dst = Grown(r, antialias ? 8 : 2);
+}
+
 // The growth of two pixels covers what rounding and thin strokes put outside the bounds, and what
 // CalcBitsDirty cuts off.
 void DisplayList::InvalidateRect(const SRECT* r)
 {
     if (RectIsEmpty(r))
         return;
-    const SRECT grown = Grown(r, antialias ? 8 : 2);
+    SRECT grown;
+    Grow(r, &grown);
     if (!RectTestIntersect(&grown, &devViewRect))
         return;
     SRECT* entry = &dirtyList[nDirty];

@@ -117,6 +117,8 @@ public:
 
     // Marks device area `r`, grown by two pixels, as to be repainted.
     void InvalidateRect(const SRECT* r);
+    // `r` with what rounding and hairlines may put beside it; empty stays empty.
+    void Grow(const SRECT* r, SRECT* dst) const;
     // One merge of the cheapest pair of dirty rectangles, if it pays or is forced. True when
     // merged.
     bool MergeDirtyList(bool forced);

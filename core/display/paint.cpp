@@ -37,7 +37,10 @@ REdge VerticalEdge(RColor* color, S32 x, S32 ymin, S32 ymax)
 void DisplayList::Update()
 {
     CalcUpdate();
+    recordsLeft = gLimits.shapeRecords;
     if (nDirty > 0 && bits) {
+        if (bits->HasBits())
+            root.BuildNew({camera, cameraCxform});
         while (MergeDirtyList(false)) {
         }
         MakeDisjoint();
@@ -56,7 +59,6 @@ void DisplayList::UpdateRect(const SRECT* r)
 {
     if (!bits || !bits->HasBits() || r->xmin >= r->xmax || r->ymin >= r->ymax)
         return;
-    recordsLeft = gLimits.shapeRecords;
     RColor background = {}, focus = {};
     REdge edges[2];
     REdge* bars = nullptr;

@@ -201,7 +201,7 @@ void DisplayList::DoRemove(SObject** link)
 {
     SObject* obj = *link;
     if (obj->drawn)
-        InvalidateRect(&obj->devBounds);
+        InvalidateRect(obj->DrawnPlace());
     NoteMask(obj);
     Discard(Unlink(link));
 }

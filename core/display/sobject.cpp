@@ -1,12 +1,21 @@
 // The object tree: change tracking, bounds, and the end of an object.
 #include "core/display/sobject.h"
 
+#include <algorithm>
+
 #include "core/display/display_list.h"
+#include "core/player/limits.h"
 #include "core/shape/character_parser.h"
 #include "core/shape/text_records.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
+
+static bool Inside(const SRECT& r, const SRECT& outer)
+{
+    return r.xmin >= outer.xmin && r.xmax <= outer.xmax && r.ymin >= outer.ymin &&
+           r.ymax <= outer.ymax;
+}
 
 void STransform::Concat(const STransform* inner)
 {
@@ -35,9 +44,9 @@ void SObject::CalcUpdate(const MATRIX* parentMat, bool forced)
 
 void SObject::Recalculate(const MATRIX* mat)
 {
-    FreeCache();
     if (drawn)
-        display->InvalidateRect(&devBounds);
+        display->InvalidateRect(DrawnPlace());
+    FreeCache();
     drawn = 0;
     CalcDevBounds(mat);
     display->InvalidateRect(&devBounds);
@@ -58,7 +67,7 @@ void SObject::InvalidateRemasked()
 void SObject::InvalidateDrawn()
 {
     if (drawn)
-        display->InvalidateRect(&devBounds);
+        display->InvalidateRect(DrawnPlace());
     for (SObject* child = bottomChild; child; child = child->above)
         child->InvalidateDrawn();
 }
@@ -75,11 +84,13 @@ void SObject::CalcDevBounds(const MATRIX* mat)
     MatrixTransformRect(mat, &bounds, &devBounds);
 }
 
-// Half a shape would bleed over the picture, so one that the budget cuts short is not drawn at all.
+// Half a shape would bleed over the picture, so one that the budget cuts short is not drawn at all;
+// one that a whole budget is too small for is not tried again.
 void SObject::BuildEdges(const STransform* placed)
 {
     if (built || !character || display->recordsLeft == 0)
         return;
+    const bool wholeBudget = display->recordsLeft == gLimits.shapeRecords;
     switch (character->type) {
     case kCharShape:
     case kCharMorphShape:
@@ -91,9 +102,60 @@ void SObject::BuildEdges(const STransform* placed)
     default:
         return;
     }
-    built = display->recordsLeft != 0;
-    if (!built)
+    const bool complete = display->recordsLeft != 0;
+    if (!complete)
         FreeCache();
+    built = complete || wholeBudget;
+    FindReach();
+}
+
+// Lines are as wide as their shape is scaled on the average, and never thinner than a pixel: under
+// some transforms they lie outside the bounds, as does all of a shape whose bounds are wrong.
+void SObject::FindReach()
+{
+    SRECT all = devBounds;
+    for (const REdge* e = edges; e; e = e->next) {
+        const SRECT piece = {std::min({e->anchor1x, e->controlx, e->anchor2x}),
+                             std::max({e->anchor1x, e->controlx, e->anchor2x}),
+                             std::min(e->anchor1y, e->controly),
+                             std::max(e->anchor2y, e->controly)};
+        RectUnion(&all, &piece, &all);
+    }
+    SRECT repainted;
+    display->Grow(&devBounds, &repainted);
+    reach = RectIsEmpty(&all) || Inside(all, repainted) ? devBounds : all;
+}
+
+// Not while painting: it adds to the dirt.
+void SObject::BuildNoted(const STransform* placed)
+{
+    if (built)
+        return;
+    BuildEdges(placed);
+    if (built && !RectEqual(&reach, &devBounds, 0))
+        display->InvalidateRect(&reach);
+}
+
+// Somewhere near the area: dirt is grown by as much when it is noted.
+bool SObject::MayShowIn(const SRECT* area) const
+{
+    SRECT near;
+    display->Grow(DrawnPlace(), &near);
+    return RectTestIntersect(&near, area);
+}
+
+void SObject::BuildNew(STransform placed)
+{
+    if (!visible)
+        return;
+    placed.Concat(&xform);
+    if (MayShowIn(&display->devViewRect))
+        BuildNoted(&placed);
+    if (!unbuiltBelow)
+        return;
+    unbuiltBelow = 0;
+    for (SObject* child = bottomChild; child; child = child->above)
+        child->BuildNew(placed);
 }
 
 // Kept apart from Draw: the parser's tables would stand on the stack once per level of the tree.
@@ -114,6 +176,8 @@ void SObject::BuildShapeEdges(const STransform* placed)
 void SObject::FreeCache()
 {
     built = 0;
+    for (SObject* p = parent; p && !p->unbuiltBelow; p = p->parent)
+        p->unbuiltBelow = 1;
     display->FreeEdges(edges);
     edges = nullptr;
     while (colors) {
@@ -138,7 +202,7 @@ void SObject::FreeChildren()
         SObject* child = display->Unlink(&bottomChild);
         child->FreeChildren();
         if (child->drawn)
-            display->InvalidateRect(&child->devBounds);
+            display->InvalidateRect(child->DrawnPlace());
         display->Discard(child);
     }
 }

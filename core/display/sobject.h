@@ -37,6 +37,7 @@ struct SObject {
     ScriptThread* thread;  // a sprite's or movie's own timeline, else that of the parent
     STransform xform;      // relative to the parent
     SRECT devBounds;       // device units, valid after CalcUpdate
+    SRECT reach;           // of what is built: devBounds, and the edges where they lie far outside
     U8 puppet;             // scripts have taken over: timelines no longer move it
     U8 state;              // button state
     U8 drawn;              // its edges went to the raster since the last recalculation
@@ -50,6 +51,7 @@ struct SObject {
     RColor* colors;        // of those edges
     EditText* editText;    // of a text field, owned
     U8 built;              // edges and colours are those of the shape, even when there are none
+    U8 unbuiltBelow;       // some object below may not be built
     U32 serial;            // never the same for two objects of one list: tells a recycled record
     SObject* nextAlive;    // links of the display list's objects
     SObject** aliveLink;
@@ -71,6 +73,9 @@ struct SObject {
     SObject* DrawClipBracket(CRaster* raster, const STransform* parentXform, RColor* clip);
     // Builds edges and colours under `xform` (this object's own included) unless they are cached.
     void BuildEdges(const STransform* xform);
+    // Builds what is in view and not built yet, here and below, and has repainted what reaches out
+    // of its bounds. `xform` is the parent's.
+    void BuildNew(STransform xform);
 
     // `pt` (device units) lies on this object's own shape. `xform` includes this object's.
     bool HitTestOne(const STransform* xform, const SPOINT* pt);
@@ -91,11 +96,16 @@ struct SObject {
 
     // The object has a timeline of its own.
     bool OwnsThread() const;
+    // Where it was drawn, device units.
+    const SRECT* DrawnPlace() const { return built ? &reach : &devBounds; }
     // This object is a mask for its siblings.
     bool IsClip() const { return clipDepth != 0; }
 
 private:
     void BuildShapeEdges(const STransform* placed);
+    void FindReach();
+    void BuildNoted(const STransform* placed);
+    bool MayShowIn(const SRECT* area) const;
     void Recalculate(const MATRIX* mat);
     void InvalidateRemasked();
     void InvalidateDrawn();

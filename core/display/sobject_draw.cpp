@@ -7,7 +7,7 @@ void SObject::Draw(CRaster* raster, STransform placed, RColor* clip)
     if (!visible)
         return;
     placed.Concat(&xform);
-    if (RectTestIntersect(&devBounds, raster->AreaDev())) {
+    if (MayShowIn(raster->AreaDev())) {
         BuildEdges(&placed);
         raster->AddEdges(edges, colors, clip);
         drawn = 1;

@@ -42,7 +42,7 @@ bool SObject::HitTestOne(const STransform* placed, const SPOINT* pt)
 {
     if (RectIsEmpty(&devBounds) || !RectPointIn(&devBounds, pt))
         return false;
-    BuildEdges(placed);
+    BuildNoted(placed);
     return EdgesContain(pt);
 }
 

@@ -16,7 +16,8 @@ struct Dice {
     Rgba Color() { return {U8(Upto(256)), U8(Upto(256)), U8(Upto(256)), U8(Upto(3) ? 255 : 120)}; }
     Mat Place()
     {
-        const Mat turn = Mat::Rotate(Upto(360)).Then(Mat::Scale((20 + Upto(200)) / 100.0));
+        const double scale = (20 + Upto(200)) / 100.0, squash = OneIn(3) ? 0.2 : 1;
+        const Mat turn = Mat::Rotate(Upto(360)).Then(Mat::Scale(scale, scale * squash));
         return turn.ThenTranslate(Upto(kSide * 24) - kSide * 2, Upto(kSide * 24) - kSide * 2);
     }
     ShapeBuilder Shape(bool radial)
@@ -26,7 +27,8 @@ struct Dice {
         const Mat over = Mat::Gradient(400, 400, 900, 700, Upto(360));
         const Fill fills[] = {Fill::Solid(Color()), Fill::Linear(over, stops),
                               Fill::Radial(over, stops)};
-        shape.Styles(shape.AddFill(fills[Upto(radial ? 3 : 2)]), 0);
+        const int line = OneIn(2) ? shape.AddLine({U16(Upto(300)), Color()}) : 0;
+        shape.Styles(shape.AddFill(fills[Upto(radial ? 3 : 2)]), 0, line);
         if (OneIn(2))
             return shape.Ellipse(400, 400, 100 + Upto(300), 100 + Upto(300));
         return shape.Polygon({{0, Upto(400)}, {800, Upto(300)}, {Upto(800), 800}});
@@ -36,8 +38,11 @@ struct Dice {
 Cast AnyCast(Dice& dice, bool radial)
 {
     Cast movie(kSide);
-    for (U16 id = 101; id <= 112; id++)
-        movie.DefineShape(id, id == 111 ? ShapeBuilder() : dice.Shape(radial));
+    for (U16 id = 101; id <= 112; id++) {
+        const ShapeBuilder shape = id == 111 ? ShapeBuilder() : dice.Shape(radial);
+        const Box lie = {300, 500, 300, 500};
+        movie.DefineShape(id, kTagDefineShape3, id % 4 ? shape.Bounds() : lie, shape);
+    }
     for (U16 id = 113; id <= 116; id++) {
         TagWriter tags;
         tags.Place(U16(id - 12), 1).Place(U16(id - 8), 2, dice.Place());
