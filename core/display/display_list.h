@@ -82,6 +82,7 @@ public:
     CSoundMix* soundMix = nullptr; // takes the sounds of buttons
     int editTextFlag = 0;          // some text field draws with a device font
     SCharacter* pending = nullptr; // retained for a placement that waits for a removal
+    bool colorsLost = false;       // an object that is being built has got fewer than it needs
     U32 recordsLeft = 0;  // shape records and styles that this repaint or hit test may read
     U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
     U32 tagsLeft = 0;     // tags that may still run in this tick; see ResetBudget
@@ -162,7 +163,12 @@ public:
 
     // Pool records, zeroed; null when a limit or memory forbids it.
     REdge* NewEdge() { return static_cast<REdge*>(edgeAlloc.Alloc()); }
-    RColor* NewColor() { return static_cast<RColor*>(colorAlloc.Alloc()); }
+    RColor* NewColor()
+    {
+        auto* color = static_cast<RColor*>(colorAlloc.Alloc());
+        colorsLost = colorsLost || !color;
+        return color;
+    }
 
 private:
     friend struct SObject;

@@ -85,12 +85,13 @@ void SObject::CalcDevBounds(const MATRIX* mat)
 }
 
 // Half a shape would bleed over the picture, so one that the budget cuts short is not drawn at all;
-// one that a whole budget is too small for is not tried again.
+// one that a whole budget or the pool of colours is too small for is not tried again.
 void SObject::BuildEdges(const STransform* placed)
 {
     if (built || !character || display->recordsLeft == 0)
         return;
     const bool wholeBudget = display->recordsLeft == gLimits.shapeRecords;
+    display->colorsLost = false;
     switch (character->type) {
     case kCharShape:
     case kCharMorphShape:
@@ -102,10 +103,10 @@ void SObject::BuildEdges(const STransform* placed)
     default:
         return;
     }
-    const bool complete = display->recordsLeft != 0;
+    const bool complete = display->recordsLeft != 0 && !display->colorsLost;
     if (!complete)
         FreeCache();
-    built = complete || wholeBudget;
+    built = complete || wholeBudget || display->colorsLost;
     FindReach();
 }
 

@@ -43,6 +43,7 @@ void SFont::ReadPlain(const SCharacter* ch)
     const U32 flags = info.Byte(1 + info.Byte(0));
     style = U8((flags & kInfoBold ? kBold : 0) | (flags & kInfoItalic ? kItalic : 0) |
                (flags & kInfoWideCodes ? kWideCodes : 0));
+    codes = info.From(2 + info.Byte(0));
 }
 
 void SFont::ReadWithLayout(const SCharacter* ch)
@@ -52,11 +53,17 @@ void SFont::ReadWithLayout(const SCharacter* ch)
                (flags & kFontWideCodes ? kWideCodes : 0) |
                (flags & kFontWideOffsets ? kWideOffsets : 0) | (flags & kFontLayout ? kLayout : 0));
     info = Block(ch->data - ch->font.distance, ch->font.distance);
-    ownCodes = true;
+    ownInfo = true;
     glyphCount = ch->font.glyphCount;
     const U32 tableBytes = (glyphCount + 1) * (flags & kFontWideOffsets ? 4 : 2);
-    if (tableBytes > table.len)
+    if (tableBytes > table.len) {
         glyphCount = 0;
+        return;
+    }
+    // Behind the glyphs, where the last offset points.
+    codes = table.From(Offset(glyphCount));
+    if (flags & kFontLayout)
+        layout = codes.From(glyphCount * CodeBytes());
 }
 
 U32 SFont::Offset(U32 index) const
@@ -74,26 +81,13 @@ SBytes SFont::Glyph(U32 glyph) const
 std::string_view SFont::Name() const
 {
     const SBytes text = info.From(1);
-    const U32 most = ownCodes && text.len >= 2 ? text.len - 2 : text.len;
+    const U32 most = ownInfo && text.len >= 2 ? text.len - 2 : text.len;
     const U32 len = info.Byte(0) < most ? info.Byte(0) : most;
     return len > 0 ? std::string_view(reinterpret_cast<const char*>(text.at), len)
                    : std::string_view();
 }
 
-// Behind the glyphs, where the last offset points, or behind the record's name and flags.
-SBytes SFont::Codes() const
-{
-    if (!ownCodes)
-        return info.From(2 + info.Byte(0));
-    return glyphCount > 0 ? table.From(Offset(glyphCount)) : SBytes{};
-}
-
-SBytes SFont::Layout() const
-{
-    return HasLayout() ? Codes().From(glyphCount * CodeBytes()) : SBytes{};
-}
-
-U32 SFont::CodeAt(const SBytes& codes, U32 glyph) const
+U32 SFont::CodeAt(U32 glyph) const
 {
     if (glyph >= glyphCount)
         return 0;
@@ -103,11 +97,10 @@ U32 SFont::CodeAt(const SBytes& codes, U32 glyph) const
 // Zeros beyond the end of a table that is cut short are no codes.
 S32 SFont::FindGlyph(U32 code) const
 {
-    const SBytes codes = Codes();
     const U32 listed = codes.len / CodeBytes();
     const U32 count = listed < glyphCount ? listed : glyphCount;
     for (U32 i = 0; i < count; ++i) {
-        if (CodeAt(codes, i) == code)
+        if (CodeAt(i) == code)
             return S32(i);
     }
     return -1;
@@ -115,5 +108,5 @@ S32 SFont::FindGlyph(U32 code) const
 
 S32 SFont::Advance(U32 glyph) const
 {
-    return glyph < glyphCount ? S16(Layout().Word(kLineMeasures + glyph * 2)) : 0;
+    return glyph < glyphCount ? S16(layout.Word(kLineMeasures + glyph * 2)) : 0;
 }

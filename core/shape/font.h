@@ -45,15 +45,15 @@ public:
     bool Italic() const { return style & kItalic; }
 
     // The character code of a glyph, 0 when there is none.
-    U32 Code(U32 glyph) const { return CodeAt(Codes(), glyph); }
+    U32 Code(U32 glyph) const { return CodeAt(glyph); }
     // The first glyph of a character code, -1 when there is none. Looks at one glyph after another.
     S32 FindGlyph(U32 code) const;
 
     // The font says how wide its glyphs and how high its lines are; the rest is 0 without.
     bool HasLayout() const { return style & kLayout; }
-    S32 Ascent() const { return S16(Layout().Word(0)); }
-    S32 Descent() const { return S16(Layout().Word(2)); }
-    S32 Leading() const { return S16(Layout().Word(4)); }
+    S32 Ascent() const { return S16(layout.Word(0)); }
+    S32 Descent() const { return S16(layout.Word(2)); }
+    S32 Leading() const { return S16(layout.Word(4)); }
     S32 Advance(U32 glyph) const;
 
 private:
@@ -63,13 +63,13 @@ private:
     void ReadWithLayout(const SCharacter* ch);
     U32 Offset(U32 index) const;
     U32 CodeBytes() const { return style & kWideCodes ? 2 : 1; }
-    SBytes Codes() const;
-    SBytes Layout() const;
-    U32 CodeAt(const SBytes& codes, U32 glyph) const;
+    U32 CodeAt(U32 glyph) const;
 
-    SBytes table;          // the offsets, and all that follows them in the tag
-    SBytes info;           // from the name's length on: the information record's, or the font's own
-    U32 glyphCount = 0;    // all with an offset
-    U8 style = 0;          // Style bits
-    bool ownCodes = false; // codes follow the glyphs, else the name in the information record
+    SBytes table;         // the offsets, and all that follows them in the tag
+    SBytes info;          // from the name's length on: the information record's, or the font's own
+    SBytes codes;         // of the glyphs, in their order
+    SBytes layout;        // from the ascent on; empty when the font has none
+    U32 glyphCount = 0;   // all with an offset
+    U8 style = 0;         // Style bits
+    bool ownInfo = false; // `info` is the font's own and ends with the glyph count
 };

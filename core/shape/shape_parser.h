@@ -95,6 +95,7 @@ private:
     bool ReadFills();
     bool ReadLines();
     U32 ReadCount();
+    bool CanHold(U32 styles) const;
     bool SizeFills(U32 count);
     bool SizeLines(U32 count);
     RColor* NewColor(U32 number);

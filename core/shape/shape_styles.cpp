@@ -1,4 +1,6 @@
 // Style blocks: counts, tables, fills and lines, plain or as pairs of a morph.
+#include <algorithm>
+
 #include "core/display/display_list.h"
 #include "core/shape/shape_parser.h"
 #include "core/stream/script_player.h"
@@ -54,6 +56,12 @@ U32 SShapeParser::ReadCount()
     return count == kEscape ? GetWord() : count;
 }
 
+// A count that lies costs nothing: no style is shorter than a byte.
+bool SShapeParser::CanHold(U32 styles) const
+{
+    return styles <= U32(limit - pos);
+}
+
 bool SShapeParser::SizeFills(U32 count)
 {
     heapFills.Clear();
@@ -86,7 +94,8 @@ RColor* SShapeParser::NewColor(U32 number)
     if (!color)
         return nullptr;
     color->SetUp(raster);
-    color->order = number + layer;
+    // Numbers beyond 16 bits would reach into the object's layer.
+    color->order = std::min(number + layer, 0xFFFFu);
     color->nextColor = *colorList;
     *colorList = color;
     return color;
@@ -104,7 +113,7 @@ bool SShapeParser::SpendRecord()
 bool SShapeParser::ReadFills()
 {
     const U32 count = ReadCount();
-    if (!SizeFills(count))
+    if (!CanHold(count) || !SizeFills(count))
         return false;
     for (U32 i = 1; i <= count; ++i) {
         RColor* color = pos < limit && SpendRecord() ? NewColor(i) : nullptr;
@@ -121,7 +130,7 @@ bool SShapeParser::ReadFills()
 bool SShapeParser::ReadLines()
 {
     const U32 count = ReadCount();
-    if (!SizeLines(count))
+    if (!CanHold(count) || !SizeLines(count))
         return false;
     for (U32 i = 1; i <= count; ++i) {
         RColor* color = pos < limit && SpendRecord() ? NewColor(i + nFills) : nullptr;

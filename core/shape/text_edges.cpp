@@ -5,6 +5,7 @@
 #include "core/stream/character.h"
 
 namespace {
+constexpr U32 kGlyphCost = 8;     // records that setting up for an outline is worth
 constexpr U32 kTopOrder = 0xFFFF; // the greatest number that tells colours of an object apart
 
 class STextBuilder {
@@ -63,6 +64,8 @@ bool STextBuilder::AddGlyph()
         return true;
     if (!ChooseColor())
         return false;
+    U32& left = obj->display->recordsLeft;
+    left -= left < kGlyphCost ? left : kGlyphCost;
     MATRIX mat = records.GlyphMatrix();
     MatrixConcat(&mat, &toDevice, &mat);
     SCharacterParser parser(obj, obj->character->player, outline.at, S32(outline.len), 0, &mat);

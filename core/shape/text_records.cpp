@@ -43,6 +43,9 @@ STextRecords::ERecord STextRecords::Next()
 STextRecords::ERecord STextRecords::ReadGlyph()
 {
     --glyphsLeft;
+    const bool ended = pos >= limit && bitPos == 0;
+    if (ended && glyphBits + advanceBits > 0)
+        return kEnd; // a run that is cut short
     glyph = GetBits(glyphBits);
     advance = GetSBits(advanceBits);
     return kGlyph;

@@ -140,8 +140,10 @@ void ScriptThread::DefineFont2()
     Skip(GetByte()); // the name
     ch->font.glyphCount = GetWord();
     ch->font.distance = static_cast<U16>(pos - start);
-    if (pos > tagEnd)
-        ch->font.glyphCount = 0; // a name longer than the tag: no table can follow
+    if (pos > tagEnd) { // a name longer than the tag: no table can follow
+        ch->font.glyphCount = 0;
+        ch->font.distance = static_cast<U16>(tagEnd > start ? tagEnd - start : 0);
+    }
     KeepBody(ch);
 }
 
