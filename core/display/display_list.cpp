@@ -55,6 +55,7 @@ void DisplayList::ResetBudget()
 {
     tagsLeft = gLimits.tagsPerDraw;
     recordsLeft = gLimits.shapeRecords;
+    pixelsLeft = gLimits.decodedPixels;
     edgeAlloc.SetBudget(Blocks(gLimits.liveEdges, kEdgesPerBlock));
     objectAlloc.SetBudget(Blocks(gLimits.liveObjects, kObjectsPerBlock));
     colorAlloc.SetBudget(Blocks(gLimits.liveColors, kColorsPerBlock));
@@ -151,6 +152,7 @@ void DisplayList::FreeCache()
 SObject* DisplayList::HitTest(const SPOINT* pt)
 {
     recordsLeft = gLimits.shapeRecords;
+    pixelsLeft = gLimits.decodedPixels;
     SObject* hit = nullptr;
     root.HitTest(hit, {camera, cameraCxform}, pt);
     return hit;

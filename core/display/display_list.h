@@ -82,6 +82,7 @@ public:
     CSoundMix* soundMix = nullptr; // takes the sounds of buttons
     int editTextFlag = 0;          // some text field draws with a device font
     SCharacter* pending = nullptr; // retained for a placement that waits for a removal
+    U64 pixelsLeft = 0;            // of images that may be decoded for this repaint or hit test
     bool colorsLost = false;       // an object that is being built has got fewer than it needs
     U32 recordsLeft = 0;  // shape records and styles that this repaint or hit test may read
     U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes

@@ -38,6 +38,7 @@ void DisplayList::Update()
 {
     CalcUpdate();
     recordsLeft = gLimits.shapeRecords;
+    pixelsLeft = gLimits.decodedPixels;
     if (nDirty > 0 && bits) {
         if (bits->HasBits())
             root.BuildNew({camera, cameraCxform});

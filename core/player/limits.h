@@ -22,6 +22,9 @@ struct SLimits {
     U32 jpegBytes = 192u << 20;
     // Pixels of a JPEG image times its scans: as many of the scans are decoded as this allows.
     U32 jpegScanPixels = 512u << 20;
+    // Pixels of images that are decoded for one repaint or hit test. Further
+    // ones are drawn like broken ones until their shape is built anew.
+    U32 decodedPixels = 128u << 20;
     // Display objects inside one another. A deeper one is not placed.
     S32 nesting = 128;
     // Display objects alive in one display list. Further ones are not placed.

@@ -42,8 +42,15 @@ struct SBitmapCore {
     // Frees the pixels and the colour table; safe to call twice.
     void PIFree();
 
-    // Pixels, 0 when there are none.
-    U64 PixelCount() const { return baseAddr ? U64(width) * U64(height) : 0; }
+    // What w x h pixels count for in the budgets of all who keep images: no less than a colour
+    // table takes.
+    static U64 PixelCost(S32 w, S32 h)
+    {
+        const U64 pixels = U64(w) * U64(h);
+        return pixels > 512 ? pixels : 512;
+    }
+    // The same of this store, 0 when there are none.
+    U64 PixelCost() const { return baseAddr ? PixelCost(width, height) : 0; }
 
     // The colour at (x, y); outside the image the nearest edge pixel's. The store must have pixels.
     void GetRGBPixel(int x, int y, RGBI* dst) const;

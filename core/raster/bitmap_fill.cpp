@@ -9,6 +9,7 @@
 namespace {
 constexpr S32 kPiece = 256;         // pixels handled at once
 constexpr S32 kTiledExtent = 2048;  // pixels over which tiles must not drift to count as unscaled
+constexpr S64 kCameraError = 16;    // by which the scale is off at 20 twips a pixel
 constexpr S64 kDriftLimit = 0x8000; // half a pixel
 
 static_assert(sizeof(RChannelMaps) <= kRampEntries * sizeof(U32));
@@ -85,13 +86,16 @@ bool BuildTransform(RColor* color)
 bool DriftsLittle(S32 scale, S32 side, bool tiled)
 {
     const S64 off = std::abs(S64(scale) - 0x10000);
-    return off * (tiled ? std::max(side, kTiledExtent) : side) <= kDriftLimit;
+    return off <= kCameraError ||
+           off * (tiled ? std::max(side, kTiledExtent) : side) <= kDriftLimit;
 }
 
 // The whole pixel nearest to where the image's own 0 comes to lie.
-S32 Origin(S32 translation, S32 scale)
+S32 Origin(S64 translation, S32 scale)
 {
-    return S32(((-S64(translation) << 16) / scale + 0x8000) >> 16);
+    const S64 far = S64(1) << 46;
+    const S64 at = std::clamp(-translation, -far, far) * 0x10000 / scale;
+    return S32(std::clamp<S64>((at + 0x8000) >> 16, kS32Min / 2, kS32Max / 2));
 }
 
 // Drawn at its own size the image is copied pixel by pixel, wherever between two pixels it lies.
@@ -103,7 +107,8 @@ void FindOrigin(RColor* color)
                             DriftsLittle(m.a, color->bitmap->width, tiled) &&
                             DriftsLittle(m.d, color->bitmap->height, tiled);
     if (color->bitmapUnscaled)
-        color->bitmapOrigin = {Origin(m.tx, m.a), Origin(m.ty, m.d)};
+        color->bitmapOrigin = {Origin(color->bitmapStart.x, m.a),
+                               Origin(color->bitmapStart.y, m.d)};
 }
 
 void DrawBitmapSlab(RColor* color, S32 x0, S32 x1)
@@ -169,10 +174,13 @@ void CompositeBitmapSlab(RColor* color, S32 x0, S32 x1, RGBI* dst)
 bool BuildBitmapCache(RColor* color)
 {
     SBitmapCore* bitmap = color->bitmap;
-    if (!bitmap || !bitmap->baseAddr || !BuildTransform(color))
+    if (!bitmap || !bitmap->baseAddr)
         return false;
+    // Held in any case: pixels that go again with every fill would be decoded for every fill.
     bitmap->useCount += !color->bitmapHeld;
     color->bitmapHeld = 1;
+    if (!BuildTransform(color))
+        return false;
     FindOrigin(color);
     ChooseBitmapRows(color);
     const bool isCopy = color->bitmapUnscaled && bitmap->bmFormat == 5;

@@ -15,6 +15,13 @@ S64 Wrap(S64 v, S64 m)
     return rest < 0 ? rest + m : rest;
 }
 
+// The same for a v that is rarely more than one m away.
+S64 Tile(S64 v, S64 m)
+{
+    const S64 next = v < 0 ? v + m : v >= m ? v - m : v;
+    return next >= 0 && next < m ? next : Wrap(v, m);
+}
+
 // One pixel of an image as a word, by format: column x of a row.
 struct Source {
     const U8* base;
@@ -92,8 +99,8 @@ struct RowWalk {
     {
         const MATRIX& m = c->bitmapInv;
         const S64 y = c->raster->CurrentRow();
-        u = S64(m.a) * x + S64(m.c) * y + m.tx;
-        v = S64(m.b) * x + S64(m.d) * y + m.ty;
+        u = S64(m.a) * x + S64(m.c) * y + c->bitmapStart.x;
+        v = S64(m.b) * x + S64(m.d) * y + c->bitmapStart.y;
         du = m.a;
         dv = m.b;
         width = S64(c->bitmap->width) << 16;
@@ -113,8 +120,8 @@ struct RowWalk {
         u += n * du;
         v += n * dv;
         if (tiled && (U64(u) >= U64(width) || U64(v) >= U64(height))) {
-            u = Wrap(u, width);
-            v = Wrap(v, height);
+            u = Tile(u, width);
+            v = Tile(v, height);
         }
     }
 
@@ -339,9 +346,20 @@ template <typename S, typename Out> void UnscaledRow(const RColor* c, S32 x, S32
     }
 }
 
+// An image of one pixel is that colour everywhere.
+template <typename S, typename Out> void OnePixelRow(const RColor* c, S32, S32 n, Out* dst)
+{
+    const U32 word = At(S(c), 0, 0);
+    for (S32 i = 0; i < n; ++i)
+        Put(dst + i, word);
+}
+
 template <typename S> void ChooseRows(RColor* c)
 {
-    if (c->bitmapUnscaled) {
+    if (c->bitmap->width == 1 && c->bitmap->height == 1) {
+        c->bitmapRow = OnePixelRow<S, RGBI>;
+        c->bitmapWords = OnePixelRow<S, U32>;
+    } else if (c->bitmapUnscaled) {
         c->bitmapRow = UnscaledRow<S, RGBI>;
         c->bitmapWords = UnscaledRow<S, U32>;
     } else if (c->raster->Smoothing()) {

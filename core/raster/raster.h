@@ -196,10 +196,10 @@ private:
     CBitBuffer* output = nullptr;
     CBitBuffer* backgroundBits = nullptr;
     const CPixelOps* ops;
-    CRow outRow; // the current one
+    CRow outRow;               // the current one
     GrowBuffer<S16> errorRows; // two of CRow::errors, in turns; empty: the output diffuses nothing
     bool oddErrors = false;    // the second one is the current row's
-    S32 rowY = 0; // current pixel row
+    S32 rowY = 0;              // current pixel row
     int antialias = 0;
     int smoothing = 0;
     bool alphaOutput = false;

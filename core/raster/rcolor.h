@@ -30,6 +30,12 @@ using RBuildSlabProc = void (*)(RColor* color, S32 x0, S32 x1, RGBI* dst);
 using RBitmapRowProc = void (*)(const RColor* color, S32 x, S32 n, RGBI* dst);
 using RBitmapWordsProc = void (*)(const RColor* color, S32 x, S32 n, U32* dst);
 
+// A place in an image, 16.16 pixels, that may be far outside.
+struct RWidePoint {
+    S64 x;
+    S64 y;
+};
+
 constexpr int kRampEntries = 257;
 
 // A colour of one object's style table. Objects keep theirs on a list through nextColor and
@@ -79,7 +85,8 @@ struct RColor {
     SPOINT bitmapOrigin;          // ... the image's first one to this pixel of the output
     ColorTransform cxform;        // the instance's transform, for a bitmap fill
     MATRIX bitmapMat;             // bitmap pixels to shape
-    MATRIX bitmapInv;             // device point << 16 to bitmap pixels << 16
+    MATRIX bitmapInv;             // device point << 16 to bitmap pixels << 16: a to d ...
+    RWidePoint bitmapStart;       // ... and the translation, which needs more than 32 bits far out
     const U32* bitmapPalette;     // 256 premultiplied words of a colour-mapped image, transformed
     RChannelMaps* maps;           // the transform for other images; null: none
     RBitmapRowProc bitmapRow;     // the loop that samples; null: there is nothing to sample

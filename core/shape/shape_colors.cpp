@@ -26,8 +26,9 @@ MATRIX WithoutTranslation(const MATRIX& m)
 
 // The inverse of `fillMat` followed by the base matrix, both with translations that carry `shift`
 // fraction bits. Those leave 32 bits a few hundred pixels from the origin, so they are kept in 64
-// until the inverse is there.
-void SShapeParser::InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const
+// until the inverse is there. Returns the inverse's translation, which `inverse` has cut to 32
+// bits.
+RWidePoint SShapeParser::InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const
 {
     MATRIX base = mat;
     if (raster->Antialias()) {
@@ -45,9 +46,12 @@ void SShapeParser::InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse)
     MatrixConcat(&first, &whole, &whole);
     // What has no inverse gives the identity, and that without a translation.
     if (!MatrixInvert(&whole, inverse))
-        return;
-    inverse->tx = S32(-(WideMul(tx, inverse->a) + WideMul(ty, inverse->c)));
-    inverse->ty = S32(-(WideMul(ty, inverse->d) + WideMul(tx, inverse->b)));
+        return {0, 0};
+    const RWidePoint moved = {-(WideMul(tx, inverse->a) + WideMul(ty, inverse->c)),
+                              -(WideMul(ty, inverse->d) + WideMul(tx, inverse->b))};
+    inverse->tx = S32(moved.x);
+    inverse->ty = S32(moved.y);
+    return moved;
 }
 
 void SShapeParser::SetupColor(RColor* color)
@@ -55,7 +59,7 @@ void SShapeParser::SetupColor(RColor* color)
     if (!raster)
         return;
     if (color->colorType == kColorBitmap) {
-        InvertFill(&color->bitmapMat, kBitmapShift, &color->bitmapInv);
+        color->bitmapStart = InvertFill(&color->bitmapMat, kBitmapShift, &color->bitmapInv);
         color->transparent = color->bitmap->transparent || cxform.LowersAlpha();
         if (!color->bitmap->baseAddr) {
             color->colorType = kColorSolid;

@@ -115,7 +115,7 @@ private:
     void SetPen(const SPOINT& pen);
     int ReadStyleChange();
 
-    void InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const;
+    RWidePoint InvertFill(const MATRIX* fillMat, int shift, MATRIX* inverse) const;
 
     bool morphStyles = false; // styles are pairs, also where they are renewed inside the records
     bool styleless = false;   // a list that cannot renew its styles

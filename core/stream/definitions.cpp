@@ -1,5 +1,7 @@
 // Tags that enter characters into the dictionary, or hang a record on one that is there. Little is
 // read now: the rest of a body is read when the character is shown.
+#include <algorithm>
+
 #include "core/display/display_list.h"
 #include "core/stream/script_player.h"
 #include "core/stream/script_thread.h"
@@ -7,7 +9,8 @@
 #include "core/stream/tags.h"
 
 namespace {
-constexpr U16 kEditOwnGlyphs = 0x0100; // drawn with the movie's font, not with a device font
+constexpr S32 kMaxTableBytes = 0x10000; // the tables of a JPEG stream need far less
+constexpr U16 kEditOwnGlyphs = 0x0100;  // drawn with the movie's font, not with a device font
 } // namespace
 
 // Codes without a case are skipped: unknown ones, and those of sounds and actions.
@@ -110,7 +113,7 @@ void ScriptThread::DefineJPEGTables()
     if (!player || player->jpegInfo)
         return;
     player->jpegInfo = script + pos;
-    player->jpegInfoLen = tagEnd - pos;
+    player->jpegInfoLen = std::min(tagEnd - pos, kMaxTableBytes);
 }
 
 void ScriptThread::DefineButton()

@@ -1,4 +1,5 @@
 // The dictionary: who is defined, who still uses a definition, and when its record dies.
+#include <algorithm>
 #include <cstdlib>
 
 #include "core/display/display_list.h"
@@ -193,12 +194,15 @@ bool ScriptPlayer::HasRoomFor(U64 pixels) const
 bool ScriptPlayer::CreatePixels(SCharacter* ch, int format, S32 width, S32 height,
                                 const SColorTable* ctab)
 {
-    const U64 pixels = U64(width) * U64(height);
+    const U64 pixels = SBitmapCore::PixelCost(width, height);
     if (pixels > gLimits.bitmapPixels)
         return false;
-    if (!HasRoomFor(pixels))
-        DropUnusedPixels();
-    if (!HasRoomFor(pixels))
+    retryImage = display && display->pixelsLeft < pixels;
+    if (!retryImage && !HasRoomFor(pixels)) {
+        MakeRoom();
+        retryImage = !HasRoomFor(pixels);
+    }
+    if (retryImage)
         return false;
     if (!ch->bitmap.PICreate(format, width, height, ctab, 1)) {
         ch->bitmap.PIFree();
@@ -206,12 +210,22 @@ bool ScriptPlayer::CreatePixels(SCharacter* ch, int format, S32 width, S32 heigh
     }
     livePixels += pixels;
     allPixels += pixels;
+    if (display)
+        display->pixelsLeft -= pixels;
     return true;
+}
+
+// Looking through the whole dictionary is paid for like reading as many records.
+void ScriptPlayer::MakeRoom()
+{
+    if (display)
+        display->recordsLeft -= std::min(display->recordsLeft, characterCount);
+    DropUnusedPixels();
 }
 
 void ScriptPlayer::DropPixels(SCharacter* ch)
 {
-    const U64 pixels = ch->bitmap.PixelCount();
+    const U64 pixels = ch->bitmap.PixelCost();
     livePixels -= pixels;
     allPixels -= pixels;
     ch->bitmap.PIFree();

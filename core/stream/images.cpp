@@ -196,9 +196,10 @@ void DecodeImage(SCharacter* ch)
     if (code < 0 || tag.tagEnd >= kMaxTagBytes)
         return;
     tag.GetWord(); // the id
-    const ScriptPlayer* movie = ch->player;
+    ScriptPlayer* movie = ch->player;
     switch (code) {
     case kTagDefineBits:
+        movie->retryImage = !movie->jpegInfo;
         if (movie->jpegInfo)
             DecodeJPEG(tag, {movie->jpegInfo, movie->jpegInfoLen}, ch);
         return;
@@ -217,8 +218,9 @@ bool ScriptThread::BuildBits(SCharacter* ch)
     if (!ch || ch->type != kCharBitmap)
         return false;
     if (!ch->bitmap.baseAddr && !ch->bitmap.buildFailed) {
+        ch->player->retryImage = false;
         DecodeImage(ch);
-        ch->bitmap.buildFailed = !ch->bitmap.baseAddr;
+        ch->bitmap.buildFailed = !ch->bitmap.baseAddr && !ch->player->retryImage;
     }
     return ch->bitmap.baseAddr != nullptr;
 }

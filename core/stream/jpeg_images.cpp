@@ -65,6 +65,9 @@ bool FindStart(jpeg_source_mgr* source)
     static const JOCTET kStart[2] = {0xFF, 0xD8};
     const JOCTET* end = source->next_input_byte + source->bytes_in_buffer;
     source->next_input_byte = std::search(source->next_input_byte, end, kStart, kStart + 2);
+    while (end - source->next_input_byte >= 4 &&
+           std::equal(kStart, kStart + 2, source->next_input_byte + 2))
+        source->next_input_byte += 2; // doubled, which would be a fatal error
     source->bytes_in_buffer = static_cast<size_t>(end - source->next_input_byte);
     return source->bytes_in_buffer > 0;
 }

@@ -42,6 +42,7 @@ public:
     U32 version = 0;
     const U8* jpegInfo = nullptr; // body of the tag with the shared JPEG tables; null: none yet
     S32 jpegInfoLen = 0;
+    bool retryImage = false; // the image tried last lacked room or tables: it may be had later
     StreamData* stream = nullptr; // the stream that feeds this movie
     bool varsMode = false;        // the stream carries variables, not a movie
     S32 varsLayer = -1;           // level that receives them
@@ -70,8 +71,9 @@ public:
     void FreeCache();
 
     // Creates the pixels of a bitmap of this movie, all zero, for whoever decodes it; see
-    // SBitmapCore::PICreate. False, and no pixels, when they fail or the movie's budget does not
-    // allow them even without the pixels that nobody uses.
+    // SBitmapCore::PICreate. False, and no pixels, when they fail, when the movie's budget does not
+    // allow them even without the pixels that nobody uses, or when enough has been decoded for one
+    // repaint.
     bool CreatePixels(SCharacter* ch, int format, S32 width, S32 height, const SColorTable* ctab);
     // Frees a bitmap's pixels, if there are any.
     void DropPixels(SCharacter* ch);
@@ -117,6 +119,7 @@ private:
     void DestroyCharacter(SCharacter* ch);
     bool HasRoomFor(U64 pixels) const;
     void DropUnusedPixels();
+    void MakeRoom();
     void RemoveRootObject();
 
     // By the high byte of the id, then by the low one: a chain may grow to 512 records, too many to
@@ -124,7 +127,7 @@ private:
     SCharacter** idPages[kIdPages] = {};
     GrowBuffer<U8> varsData; // bytes of a variables stream
     U32 characterCount = 0;  // records of the pool in use
-    U64 livePixels = 0;      // of the bitmaps that have some
+    U64 livePixels = 0;      // cost of the bitmaps that have some
 };
 
 // A user of a character's record: a pointer that must stay valid.

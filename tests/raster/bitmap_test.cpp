@@ -50,6 +50,7 @@ RColor* Fill(RasterScene& s, Image& image, const MATRIX& inverse, U8 type,
     c->bitmap = &image.core;
     c->bitmapType = type;
     c->bitmapInv = inverse;
+    c->bitmapStart = {inverse.tx, inverse.ty};
     c->cxform = cx;
     c->transparent = image.core.transparent || cx.LowersAlpha();
     c->BuildCache();

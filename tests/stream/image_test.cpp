@@ -56,7 +56,7 @@ TEST(Images, JpegRoutesAgree)
     EXPECT_EQ(Decode(6, {jpeg.image}, 8, jpeg.tables), want);
     EXPECT_EQ(Decode(6, {jpeg.whole}, 8), want);
     EXPECT_EQ(Decode(21, {jpeg.tables, jpeg.image}), want);
-    EXPECT_EQ(Decode(21, {{0xFF, 0xD9, 7}, jpeg.whole}), want) << "marks before it";
+    EXPECT_EQ(Decode(21, {{0xFF, 0xD9, 0xFF, 0xD8}, jpeg.whole}), want) << "marks before it";
     EXPECT_EQ(Decode(21, {scans.whole}), want) << "the same coefficients in scans";
     EXPECT_EQ(Decode(21, {MakeJpeg(image, false, true).whole}), Words()) << "four inks";
     EXPECT_EQ(Decode(6, {jpeg.whole}), Words()) << "no tables";
@@ -70,7 +70,7 @@ TEST(Images, JpegRoutesAgree)
 
 TEST(Images, PixelsStayWhileTheyAreUsed)
 {
-    gLimits.movieBitmapPixels = 7;
+    gLimits.movieBitmapPixels = 600; // one small image and a bit
     const Bytes body = LosslessBody({2, 2, {0xFF000080, 0xFF000040, 0, 0xFF0000C0}}, true);
     MovieWriter movie;
     movie.Raw(36, ByteWriter().PutU16(1).PutBytes(body));
@@ -82,9 +82,11 @@ TEST(Images, PixelsStayWhileTheyAreUsed)
     first->bitmap.useCount++;
     EXPECT_FALSE(s.movie.BuildBits(second)) << "no room";
     first->bitmap.useCount--;
-    EXPECT_FALSE(s.movie.BuildBits(second)) << "the failure is remembered";
-    s.movie.FreeCache();
-    EXPECT_TRUE(s.movie.BuildBits(second) && s.movie.BuildBits(first)) << "makes room";
+    EXPECT_TRUE(s.movie.BuildBits(second) && !first->bitmap.baseAddr) << "room is made";
+    s.list.pixelsLeft = 100;
+    EXPECT_FALSE(s.movie.BuildBits(first)) << "enough for one repaint";
+    s.list.pixelsLeft = 1000;
+    EXPECT_TRUE(s.movie.BuildBits(first));
     gLimits = {};
     RGBI c;
     first->bitmap.GetSSRGBPixel(0x2000, 0x2000, &c);
