@@ -2,54 +2,25 @@
 
 #include <sstream>
 
-std::vector<U8> Pcm(const std::vector<S16>& samples)
-{
-    ByteWriter out;
-    for (const S16 sample : samples)
-        out.PutU16(U16(sample));
-    return out.Bytes();
-}
-
-std::vector<U8> Adpcm(S16 first)
-{
-    return ByteWriter().UB(2, 0).SB(16, first).UB(6, 0).Bytes();
-}
-
-TagWriter& DefineSound(TagWriter& tags, U16 id, U8 format, U32 count, const std::vector<U8>& data)
-{
-    const ByteWriter body = ByteWriter().PutU16(id).PutU8(format).PutU32(count).PutBytes(data);
-    return tags.Raw(kTagDefineSound, body);
-}
-
-TagWriter& StreamHead(TagWriter& tags, U8 format, U16 samplesPerFrame, U16 leadIn)
-{
-    const ByteWriter body = ByteWriter().PutU16(format * 0x101u).PutU16(samplesPerFrame);
-    return tags.Raw(kTagSoundStreamHead, ByteWriter(body).PutU16(leadIn));
-}
-
-std::vector<U8> SoundMovie(const std::string& words, U16 samplesPerFrame, U8 format)
+std::vector<U8> SoundMovie(const std::string& words, U16 samples, U8 format, int times)
 {
     MovieWriter movie(2000, 2000, Fps(10));
-    StreamHead(movie, format, samplesPerFrame);
-    std::istringstream in(words);
-    for (char kind, comma; in >> kind;) {
-        S32 a = 0, b = 0;
-        if (isdigit(kind))
-            in.unget();
-        if (kind != '/' && kind != '.' && in >> a && kind != 'f' && !isdigit(kind))
-            in >> comma >> b;
-        const ByteWriter pair = ByteWriter().PutU16(U32(a)).PutU16(U32(b));
-        if (kind == 'd')
-            DefineSound(movie, U16(a), 14, 1, Pcm({S16(b)}));
-        else if (isdigit(kind))
-            movie.Raw(kTagSoundStreamBlock, format == 30 ? Adpcm(S16(a)) : Pcm({S16(a)}));
-        else
-            movie.Raw(kind == '/'   ? 1
-                      : kind == '.' ? 0
-                      : kind == 's' ? 15
-                      : kind == 'f' ? 3
-                                    : 19,
-                      pair);
+    movie.Raw(18, ByteWriter().PutU16(format * 0x101u).PutU16(samples).PutU16(1105));
+    const std::vector<U8> sound = {14, 1, 0, 0, 0}, none;
+    for (int turn = 1; turn <= times; turn++) {
+        std::istringstream in(words);
+        for (std::string word; in >> word;) {
+            int a = turn, b = 0;
+            std::sscanf(&word[1], "%d,%d", &a, &b);
+            ByteWriter body;
+            if (word[0] == 'b' && format == 30)
+                body.UB(2, 0).SB(16, a).UB(6, 0);
+            else
+                body.PutU16(U32(a)).PutBytes(word[0] == 'd' ? sound : none).PutU16(U32(b));
+            constexpr int kTags[] = {1, 19, 19, 14, 15, 3};
+            movie.Raw(kTags[std::string("/bmdsf").find(word[0])], body);
+        }
     }
+    movie.End();
     return movie.Bytes();
 }
