@@ -1,5 +1,7 @@
 #include "platform/headless/native_player.h"
 
+#include "platform/headless/headless_sound.h"
+
 namespace {
 
 S64 gClock = 0; // microseconds
@@ -74,7 +76,29 @@ bool NativePlayerWnd::CanTick() const
 void NativePlayerWnd::Tick()
 {
     AdvanceHeadlessClock(static_cast<S64>(frameDelay) * 1000);
+    if (mixer)
+        mixer->Pump();
     DoPlay(1);
+}
+
+void NativePlayerWnd::PlayThrough(NativeSoundMix* mix)
+{
+    mixer = mix;
+    scene.soundMix = mix;
+}
+
+bool NativePlayerWnd::HasStream() const
+{
+    for (const ScriptThread* thread = scene.threads; thread; thread = thread->nextThread)
+        if (thread->streamChannel)
+            return true;
+    return false;
+}
+
+void NativePlayerWnd::StopPainting()
+{
+    paints = false;
+    FreeBuffer();
 }
 
 const CBitBuffer* NativePlayerWnd::Picture()
@@ -110,7 +134,7 @@ void NativePlayerWnd::InvalidateScreenArea(const SRECT* r)
 
 void NativePlayerWnd::ClientRect(SRECT* r)
 {
-    *r = {0, width, 0, height};
+    *r = paints ? SRECT{0, width, 0, height} : SRECT{};
 }
 
 void NativePlayerWnd::AdjustWindow(S32 pixelWidth, S32 pixelHeight)

@@ -5,6 +5,8 @@
 
 #include "core/player/player.h"
 
+class NativeSoundMix;
+
 // The hand-cranked clock behind real_time_clock_usecs(): one for the process, starts at 0.
 void SetHeadlessClock(S64 usecs);
 void AdvanceHeadlessClock(S64 usecs);
@@ -25,8 +27,14 @@ public:
     // The next tick can show what it should: the root timeline has the data of its next frame, or
     // needs none.
     bool CanTick() const;
-    // Advances the clock by one frame delay and plays one tick.
+    // Advances the clock by one frame delay, has the mixer play as far as that, and plays one tick.
     void Tick();
+    // Its sounds go to that mixer, which must outlive it; before any data.
+    void PlayThrough(NativeSoundMix* mix);
+    // A timeline has a streaming sound, which wants to read ahead of the picture.
+    bool HasStream() const;
+    // From now on nothing is painted, and Picture has nothing to give: for those who only listen.
+    void StopPainting();
     // The pixels as the last tick left them; brings the screen up to date first. Null without
     // pixels.
     const CBitBuffer* Picture();
@@ -62,6 +70,8 @@ private:
     S32 height;
     bool ownSize; // the area follows the movie
     bool sizeReported = false;
+    bool paints = true;
+    NativeSoundMix* mixer = nullptr; // not owned; null: Tick has none to pump
     bool timerRuns = false;
     S32 timerInterval = 0;
 };

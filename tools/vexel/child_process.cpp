@@ -17,7 +17,7 @@ namespace {
 
 // Our SIGPIPE is ignored; the child gets the usual one back.
 int Spawn(const std::vector<std::string>& words, int input, int messages, bool sharesOutput,
-          pid_t* id)
+          int extra, pid_t* id)
 {
     std::vector<char*> arguments;
     for (const std::string& word : words)
@@ -29,6 +29,9 @@ int Spawn(const std::vector<std::string>& words, int input, int messages, bool s
     posix_spawn_file_actions_adddup2(&files, messages, STDERR_FILENO);
     if (!sharesOutput)
         posix_spawn_file_actions_addopen(&files, STDOUT_FILENO, "/dev/null", O_WRONLY, 0);
+    // Last, since any of the others may be the third. The same number on both sides stays open.
+    if (extra >= 0)
+        posix_spawn_file_actions_adddup2(&files, extra, 3);
     posix_spawnattr_t how;
     posix_spawnattr_init(&how);
     sigset_t usual;
@@ -59,13 +62,13 @@ void ChildProcess::Kill()
     Wait();
 }
 
-int ChildProcess::Start(const std::vector<std::string>& words, bool sharesOutput)
+int ChildProcess::Start(const std::vector<std::string>& words, bool sharesOutput, int extra)
 {
     int ends[2];
     said = std::tmpfile();
     if (said == nullptr || pipe2(ends, O_CLOEXEC) != 0)
         return errno;
-    const int error = Spawn(words, ends[0], fileno(said), sharesOutput, &id);
+    const int error = Spawn(words, ends[0], fileno(said), sharesOutput, extra, &id);
     close(ends[0]);
     if (error != 0) {
         close(ends[1]);

@@ -1,4 +1,5 @@
-// Video, encoded by the program ffmpeg when there is one: it gets R, G, B, A through a pipe.
+// Video, encoded by the program ffmpeg when there is one: it gets R, G, B, A through a pipe, and
+// the sound as a WAV file that is there already.
 #include "tools/vexel/child_process.h"
 #include "tools/vexel/output_file.h"
 #include "tools/vexel/picture_sink.h"
@@ -16,6 +17,7 @@ struct VideoForm {
     const char* muxer;
     bool evenSides; // colours are kept for blocks of 2x2 pixels
     Words (*encoder)(bool alpha, bool seekable);
+    Words sound; // how that is encoded
 };
 
 void Append(Words* words, const Words& more)
@@ -61,9 +63,9 @@ Words MkvEncoder(bool alpha, bool)
     return {"-c:v", "ffv1", "-level", "3", "-g", "24", "-pix_fmt", alpha ? "bgra" : "bgr0"};
 }
 
-constexpr VideoForm kMp4 = {"mp4", true, Mp4Encoder};
-constexpr VideoForm kWebm = {"webm", true, WebmEncoder};
-constexpr VideoForm kMkv = {"matroska", false, MkvEncoder};
+const VideoForm kMp4 = {"mp4", true, Mp4Encoder, {"-c:a", "aac", "-b:a", "192k"}};
+const VideoForm kWebm = {"webm", true, WebmEncoder, {"-c:a", "libopus", "-b:a", "160k"}};
+const VideoForm kMkv = {"matroska", false, MkvEncoder, {"-c:a", "flac"}};
 
 class FfmpegSink : public PictureSink {
 public:
@@ -117,6 +119,10 @@ Words FfmpegSink::CommandLine(const PictureForm& form) const
                    Format("1000/%d", form.delay),
                    "-i",
                    "pipe:0"};
+    if (form.sound >= 0) {
+        Append(&words, {"-f", "wav", "-i", "pipe:3"});
+        Append(&words, video.sound);
+    }
     Append(&words, video.encoder(form.alpha, !ToStdout()));
     Append(&words, {"-f", video.muxer, ToStdout() ? "pipe:1" : "file:" + place.part});
     return words;
@@ -130,7 +136,7 @@ bool FfmpegSink::Begin(const PictureForm& form)
     making = !ToStdout();
     if (making && !MakePart())
         return Fail(path, Format("cannot write: %s", std::strerror(errno)));
-    const int error = child.Start(CommandLine(form), ToStdout());
+    const int error = child.Start(CommandLine(form), ToStdout(), form.sound);
     if (error == ENOENT)
         return Fail(path, "writing it takes ffmpeg, which is not on the PATH");
     return error == 0 || Fail(path, Format("cannot start ffmpeg: %s", std::strerror(error)));

@@ -7,8 +7,8 @@
 namespace {
 
 constexpr char kHelp[] =
-    "usage: vexel render MOVIE -o OUT [options]    pictures of a movie\n"
-    "       vexel info MOVIE [--json]              header, tags, labels, characters\n"
+    "usage: vexel render MOVIE -o OUT [options]    pictures or sound of a movie\n"
+    "       vexel info MOVIE [--json]              header, tags, labels, characters, sounds\n"
     "       vexel dump MOVIE                       every tag, one a line\n"
     "       vexel --help | --version\n"
     "\n"
@@ -17,11 +17,11 @@ constexpr char kHelp[] =
     "render:\n"
     "  -o OUT                       .png, NAME%04d.png for a sequence, .gif .apng .y4m .rgba, "
     ".mp4\n"
-    "                               .webm .mkv (through ffmpeg), or - for standard output\n"
+    "                               .webm .mkv (through ffmpeg), .wav, or - for standard output\n"
     "  --format NAME                png, gif, apng, ...: whatever the name of OUT\n"
     "  --frame N                    picture N, counted from 1\n"
     "  --frames A-B                 pictures A to B\n"
-    "  --duration S                 the pictures of the first S seconds\n"
+    "  --duration S                 the first S seconds\n"
     "                               (none of these: picture 1 as PNG, otherwise one pass of the\n"
     "                               main timeline)\n"
     "  --size WxH                   pixels (default: the movie's own)\n"

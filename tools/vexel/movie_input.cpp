@@ -6,8 +6,10 @@
 #include <cerrno>
 #include <cstring>
 #include <fcntl.h>
+#include <memory>
 #include <sys/stat.h>
 #include <unistd.h>
+#include <vector>
 
 MovieInput::~MovieInput()
 {
@@ -31,6 +33,52 @@ bool MovieInput::Open(const std::string& movieName)
     if (S_ISREG(info.st_mode))
         size = info.st_size;
     return true;
+}
+
+int MovieInput::MakeRepeatable()
+{
+    start = lseek(fd, 0, SEEK_CUR);
+    if (start >= 0)
+        return kExitDone;
+    std::FILE* copy = std::tmpfile();
+    const int code = copy != nullptr ? CopyTo(copy) : kExitFailed;
+    if (copy == nullptr || (code == kExitDone && std::fflush(copy) != 0)) {
+        Complain(name, Format("no temporary file for it: %s", std::strerror(errno)));
+        return kExitFailed;
+    }
+    const int copied = dup(fileno(copy));
+    std::fclose(copy);
+    if (fd > STDIN_FILENO)
+        close(fd);
+    fd = copied;
+    start = 0;
+    size = lseek(fd, 0, SEEK_END);
+    Rewind();
+    return code;
+}
+
+// No more than the movie, whose header says how long it is: what follows may have no end. A failed
+// write shows when the file is flushed.
+int MovieInput::CopyTo(std::FILE* copy)
+{
+    const auto movie = std::make_unique<ScriptPlayer>();
+    std::vector<U8> block(64 * 1024);
+    int code = kExitDone;
+    while (code == kExitDone && !ended && !movie->Complete()) {
+        const S64 n = Read(block.data(), block.size());
+        if (n < 0)
+            return kExitUnreadable;
+        std::fwrite(block.data(), 1, static_cast<size_t>(n), copy);
+        movie->PushDataBuf(block.data(), static_cast<S32>(n));
+        code = CheckMovie(*movie);
+    }
+    return code;
+}
+
+void MovieInput::Rewind()
+{
+    lseek(fd, start, SEEK_SET);
+    ended = false;
 }
 
 S64 MovieInput::Read(U8* buffer, size_t capacity)

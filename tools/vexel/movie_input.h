@@ -4,6 +4,7 @@
 #include "core/geom/types.h"
 #include "core/stream/script_player.h"
 
+#include <cstdio>
 #include <string>
 
 // Complaints about the movie are made here, under the name it was given on the command line.
@@ -16,6 +17,12 @@ public:
 
     // "-" is standard input. False after complaining.
     bool Open(const std::string& name);
+    // Makes sure that it can be read again, and in blocks of the same size each time: what comes
+    // through a pipe is read to the movie's end into a file without a name. The exit code, after
+    // complaining when it is not 0.
+    int MakeRepeatable();
+    // Back to the beginning of what can be read again.
+    void Rewind();
     // The next block as soon as there is one; 0 at the end, -1 after complaining about a failure.
     S64 Read(U8* buffer, size_t size);
 
@@ -31,8 +38,11 @@ public:
     void ComplainTruncated(const ScriptPlayer& movie) const;
 
 private:
+    int CopyTo(std::FILE* copy);
+
     std::string name;
     int fd = -1;
     S64 size = -1;
+    S64 start = 0; // where in the file it begins
     bool ended = false;
 };

@@ -140,23 +140,28 @@ bool OutputFile::Fail()
     return false;
 }
 
-// Standard output stays open.
 bool OutputFile::Close()
 {
     const int closing = fd;
     fd = -1;
-    return closing == STDOUT_FILENO || close(closing) == 0;
+    return borrowed || close(closing) == 0;
 }
 
 bool OutputFile::Open(const std::string& path)
 {
     if (path == "-") {
-        fd = STDOUT_FILENO;
+        Borrow(STDOUT_FILENO);
         return true;
     }
     place = OutputPlace(path);
     fd = place.Open();
     return fd >= 0 || Fail();
+}
+
+void OutputFile::Borrow(int descriptor)
+{
+    fd = descriptor;
+    borrowed = true;
 }
 
 bool OutputFile::Write(std::span<const U8> bytes)

@@ -59,6 +59,8 @@ public:
     OutputFile& operator=(const OutputFile&) = delete;
 
     bool Open(const std::string& path);
+    // Takes a descriptor instead, which stays open.
+    void Borrow(int descriptor);
     bool Write(std::span<const U8> bytes);
     // Lets the other end of a pipe have all that was written.
     bool Flush();
@@ -73,6 +75,7 @@ private:
 
     OutputPlace place;
     int fd = -1;
+    bool borrowed = false;
     std::vector<U8> waiting; // not yet handed to the system
 };
 

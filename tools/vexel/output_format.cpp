@@ -9,9 +9,10 @@ static constexpr OutputFormat kFormats[] = {
     {"rgb565", true, false, MakeRawSink, kPixel16},
     {"rgb555", true, false, MakeRawSink, kPixel15},
     {"pal8", true, false, MakeRawSink, kPixel8},
-    {"mp4", true, false, MakeMp4Sink},
-    {"webm", true, true, MakeWebmSink},
-    {"mkv", true, true, MakeMkvSink},
+    {"wav", true, false, MakeWavSink, kPixel32, SoundUse::kAlone},
+    {"mp4", true, false, MakeMp4Sink, kPixel32, SoundUse::kBeside},
+    {"webm", true, true, MakeWebmSink, kPixel32, SoundUse::kBeside},
+    {"mkv", true, true, MakeMkvSink, kPixel32, SoundUse::kBeside},
 };
 
 const OutputFormat* FindFormat(const std::string& name)

@@ -3,12 +3,15 @@
 
 #include "tools/vexel/picture_sink.h"
 
+enum class SoundUse { kNone, kBeside, kAlone };
+
 struct OutputFormat {
     const char* name; // the word for --format; with a dot before it, the extension
     bool several;     // one file holds all pictures
     bool alpha;       // it can be transparent
     SinkMaker make;
     CPixelFormat pixels = kPixel32; // what the player has to paint
+    SoundUse sound = SoundUse::kNone;
 };
 
 // The format of that name; null when there is none.

@@ -1,4 +1,5 @@
-// `vexel render`: pictures of a movie, each written as soon as its data is there.
+// `vexel render`: pictures of a movie, each written as soon as its data is there, and its sound.
+#include "platform/headless/headless_sound.h"
 #include "platform/headless/native_player.h"
 #include "tools/vexel/commands.h"
 #include "tools/vexel/message.h"
@@ -6,18 +7,44 @@
 #include "tools/vexel/progress.h"
 #include "tools/vexel/render_options.h"
 
+#include <algorithm>
+#include <cerrno>
 #include <csignal>
+#include <cstdio>
+#include <cstring>
 #include <new>
+#include <unistd.h>
+#include <utility>
 
 namespace {
 
+// Frames of sound in so many milliseconds, rounded down.
+S64 SoundFrames(S64 milliseconds)
+{
+    return milliseconds * 441 / 10;
+}
+
+// One playing of the movie from its beginning into a sink.
 class Renderer {
 public:
-    explicit Renderer(const RenderOptions& renderOptions);
+    Renderer(const RenderOptions& renderOptions, MovieInput* movie,
+             std::unique_ptr<PictureSink> pictureSink);
+    // Plays for the sound alone, and leaves it to a second playing to say how the movie ends.
+    void Rehearse() { rehearsal = true; }
+    // The sound that goes with the pictures, as a WAV file of the rehearsal.
+    void AddSoundTrack(int descriptor) { soundTrack = descriptor; }
     // The exit code, after complaining when it is not 0.
     int Run();
+    // Some sound was started.
+    bool Heard() const { return heard; }
 
 private:
+    static void TakeSound(void* renderer, const S16* samples, S32 frames);
+    bool WantsSound() const { return options.format->sound != SoundUse::kNone; }
+    bool WantsPictures() const { return options.format->sound != SoundUse::kAlone && !rehearsal; }
+    void Listen();
+    void SetSoundSpan();
+    int PlayOut();
     bool FeedBlock();
     void FeedAll();
     bool Reach(int picture);
@@ -31,19 +58,28 @@ private:
     int Missing(int picture);
 
     const RenderOptions& options;
-    MovieInput input;
+    MovieInput& input;
+    NativeSoundMix mixer; // outlives the player
     NativePlayerWnd player;
     int failure = kExitDone; // of the input
     S32 framesOfWhole = -1;  // once all is there
     std::unique_ptr<PictureSink> sink;
     int last = 0; // picture, unless there is to be one pass
+    bool rehearsal = false;
+    int soundTrack = -1;
+    S64 mixed = 0; // frames of sound so far; what lies from soundStart to soundEnd is written
+    S64 soundStart = 0;
+    S64 soundEnd = 0;
+    bool soundWritten = true; // no failure so far
+    bool heard = false;
     Progress progress;
     U8 block[64 * 1024];
 };
 
-Renderer::Renderer(const RenderOptions& renderOptions)
-    : options(renderOptions), player(renderOptions.width, renderOptions.height),
-      sink(renderOptions.format->make(renderOptions.output)),
+Renderer::Renderer(const RenderOptions& renderOptions, MovieInput* movie,
+                   std::unique_ptr<PictureSink> pictureSink)
+    : options(renderOptions), input(*movie), player(renderOptions.width, renderOptions.height),
+      sink(std::move(pictureSink)),
       progress(renderOptions.progress,
                renderOptions.output.Numbered() || renderOptions.format->several)
 {
@@ -51,6 +87,48 @@ Renderer::Renderer(const RenderOptions& renderOptions)
     player.SetScreenFormat(options.Screen());
     if (options.setBackground)
         player.OverrideBackground(options.background);
+    player.PlayThrough(&mixer);
+}
+
+void Renderer::Listen()
+{
+    if (WantsPictures())
+        return;
+    player.StopPainting();
+    mixer.Listen(TakeSound, this);
+}
+
+// Of a buffer that reaches beyond the span the part inside is written.
+void Renderer::TakeSound(void* renderer, const S16* samples, S32 frames)
+{
+    Renderer* self = static_cast<Renderer*>(renderer);
+    const S64 from = std::max(self->soundStart - self->mixed, S64(0));
+    const S64 to = std::min(self->soundEnd - self->mixed, S64(frames));
+    self->mixed += frames;
+    self->heard |= self->mixer.IsDeviceOpen();
+    if (from < to && self->soundWritten)
+        self->soundWritten = self->sink->AddSound(samples + 2 * from, static_cast<S32>(to - from));
+}
+
+// From the first picture to the end of the last, or of the duration that was asked for.
+void Renderer::SetSoundSpan()
+{
+    const S64 delay = player.frameDelay;
+    soundStart = SoundFrames((options.first - 1) * delay);
+    soundEnd = SoundFrames(options.duration > 0 ? options.duration : last * delay);
+}
+
+// The sound goes on for as long as the last picture shows.
+int Renderer::PlayOut()
+{
+    if (WantsPictures())
+        return kExitDone;
+    constexpr S64 kBuffer = 46440; // microseconds
+    while (soundWritten && mixed < soundEnd) {
+        AdvanceHeadlessClock(kBuffer);
+        mixer.Pump();
+    }
+    return soundWritten ? kExitDone : FailWriting();
 }
 
 // False at the end of the input and on a failure.
@@ -76,7 +154,8 @@ void Renderer::FeedAll()
     }
 }
 
-// Brings the player from the picture before to this one, with as much data as that takes.
+// Brings the player from the picture before to this one, with as much data as that takes. A stream
+// reads ahead of the picture: what it finds must not depend on how the data arrives.
 bool Renderer::Reach(int picture)
 {
     if (picture == 1) {
@@ -84,12 +163,14 @@ bool Renderer::Reach(int picture)
         }
         return player.Started() && failure == kExitDone;
     }
+    if (player.HasStream())
+        FeedAll();
     while (!player.CanTick() && FeedBlock()) {
     }
     if (!player.CanTick() || failure != kExitDone)
         return false;
     player.Tick();
-    return true;
+    return soundWritten;
 }
 
 // One pass of the main timeline has that picture. Frames that are there are counted; how many a
@@ -130,12 +211,19 @@ int Renderer::CheckArea()
 // With the first picture at hand: what the movie says of itself is known.
 int Renderer::Begin()
 {
-    const int code = CheckArea();
+    const int code = WantsPictures() ? CheckArea() : kExitDone;
     if (code != kExitDone)
         return code;
     last = options.LastFor(player.frameDelay);
-    const PictureForm form = {player.Width(), player.Height(), player.frameDelay,
-                              options.Transparent()};
+    if (WantsSound())
+        FeedAll();
+    if (WantsSound() && options.wholePass && (failure != kExitDone || !player.Complete()))
+        return Missing(0);
+    if (WantsSound() && options.wholePass)
+        last = std::max(player.CountFrames(), 1);
+    SetSoundSpan();
+    const PictureForm form = {player.Width(),        player.Height(),       player.frameDelay,
+                              options.Transparent(), soundEnd - soundStart, soundTrack};
     return sink->Begin(form) ? kExitDone : FailWriting();
 }
 
@@ -148,6 +236,8 @@ int Renderer::FailWriting()
 
 int Renderer::WritePicture(int picture)
 {
+    if (!WantsPictures())
+        return kExitDone;
     const CBitBuffer* pixels = player.Picture();
     if (pixels == nullptr) {
         progress.End();
@@ -164,9 +254,12 @@ int Renderer::WritePicture(int picture)
 // Everything asked for is written; a file that is too short is worth a word all the same.
 int Renderer::Finish()
 {
-    if (!sink->Finish())
-        return FailWriting();
+    const int code = PlayOut();
+    if (code != kExitDone || !sink->Finish())
+        return code != kExitDone ? code : FailWriting();
     progress.End();
+    if (rehearsal)
+        return kExitDone;
     if (input.Size() >= 0 && input.Size() < player.scriptLen)
         FeedAll();
     if (input.Ended() && !player.Complete())
@@ -177,6 +270,8 @@ int Renderer::Finish()
 int Renderer::Missing(int picture)
 {
     progress.End();
+    if (!soundWritten)
+        return FailWriting();
     if (failure != kExitDone)
         return failure;
     if (!player.Complete())
@@ -188,8 +283,7 @@ int Renderer::Missing(int picture)
 
 int Renderer::Run()
 {
-    if (!input.Open(options.movie))
-        return kExitUnreadable;
+    Listen();
     for (int picture = 1;; picture++) {
         if (!Reach(picture))
             return Missing(picture);
@@ -203,6 +297,64 @@ int Renderer::Run()
     }
 }
 
+// The sound of a video comes first, from a playing of its own: an encoder that is fed both at a
+// time can wait for the one while we write the other.
+class SoundTrack {
+public:
+    SoundTrack() : file(std::tmpfile()) {}
+    ~SoundTrack()
+    {
+        if (file != nullptr)
+            std::fclose(file);
+    }
+    SoundTrack(const SoundTrack&) = delete;
+    SoundTrack& operator=(const SoundTrack&) = delete;
+
+    // The exit code, after complaining when it is not 0.
+    int Make(const RenderOptions& options, MovieInput* input);
+    // At its beginning; -1 when the movie is silent.
+    int Descriptor() const { return heard ? fileno(file) : -1; }
+
+private:
+    std::FILE* file; // without a name; null: there is none to be had
+    bool heard = false;
+};
+
+int SoundTrack::Make(const RenderOptions& options, MovieInput* input)
+{
+    if (file == nullptr) {
+        Complain(options.movie,
+                 Format("no temporary file for its sound: %s", std::strerror(errno)));
+        return kExitFailed;
+    }
+    const auto renderer = std::make_unique<Renderer>(options, input, MakeWavSpool(fileno(file)));
+    renderer->Rehearse();
+    const int code = renderer->Run();
+    heard = renderer->Heard();
+    lseek(fileno(file), 0, SEEK_SET);
+    input->Rewind();
+    SetHeadlessClock(0);
+    return code;
+}
+
+int Render(const RenderOptions& options)
+{
+    MovieInput input;
+    if (!input.Open(options.movie))
+        return kExitUnreadable;
+    const SoundUse sound = options.format->sound;
+    int code = sound != SoundUse::kNone ? input.MakeRepeatable() : kExitDone;
+    SoundTrack track;
+    if (code == kExitDone && sound == SoundUse::kBeside)
+        code = track.Make(options, &input);
+    if (code != kExitDone)
+        return code;
+    const auto renderer =
+        std::make_unique<Renderer>(options, &input, options.format->make(options.output));
+    renderer->AddSoundTrack(track.Descriptor());
+    return renderer->Run();
+}
+
 } // namespace
 
 int RenderCommand(std::span<char* const> words)
@@ -213,8 +365,7 @@ int RenderCommand(std::span<char* const> words)
     // A reader of our output that goes away shows as a failed write.
     std::signal(SIGPIPE, SIG_IGN);
     try {
-        const auto renderer = std::make_unique<Renderer>(options);
-        return renderer->Run();
+        return Render(options);
     } catch (const std::bad_alloc&) {
         Complain(options.movie, "no memory for its pictures");
         return kExitLimit;

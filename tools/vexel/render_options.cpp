@@ -197,6 +197,7 @@ int RenderOptions::LastFor(S32 delay) const
 {
     if (duration == 0)
         return last;
-    const int pictures = (duration + delay / 2) / delay;
+    const bool alone = format->sound == SoundUse::kAlone;
+    const int pictures = (duration + (alone ? delay - 1 : delay / 2)) / delay;
     return pictures > 0 ? pictures : 1;
 }

@@ -28,6 +28,7 @@ struct RenderOptions {
     bool Transparent() const { return setBackground && background.alpha == 0; }
     // The pixels that the player has to paint.
     CScreenFormat Screen() const;
-    // The last picture for a movie whose pictures show for `delay` milliseconds each.
+    // The last picture for a movie whose pictures show for `delay` milliseconds each. Of sound
+    // alone it is the last that begins within the duration.
     int LastFor(S32 delay) const;
 };
