@@ -36,7 +36,7 @@ TEST(SoundStream, EveryBlockComesOutAtItsPlace)
         SoundScene scene(SoundMovie("b1 / b2 / / b3 b4 / b5 /", 1000, U8(format)), "tpppp");
         EXPECT_EQ("0:1 1000:2 3000:3 4000:4 5000:5 ", scene.heard);
     }
-    SoundScene mpeg(SoundMovie("d1,7 m2048,0 / m0,-4096 / m0,0 / s1,0 /", 9, 46), "tppppp");
+    SoundScene mpeg(SoundMovie("d1,7 m2048,0 / m0,-4096 / m0,0 / s1,0 /", 3000, 46), "tppppp");
     EXPECT_EQ(mp3decPresent() ? "6144:7 " : "", mpeg.heard);
     SoundScene still(SoundMovie("b5 / b5 / /", 0), "tptptp");
     SoundScene unknown(SoundMovie("b5 d1,1 s2,0 s1,64 / /", 9, 0x4E), "tptpp");
