@@ -128,7 +128,7 @@ TEST_F(Tool, Lists)
           R"("characters":[{"id":1,"type":"shape","tag":"DefineShape2","code":22,)"
           R"("bounds":[-20,320,-20,220]},{"id":2,"type":"sprite","tag":"DefineSprite",)"
           R"("code":39,"frames":2},{"id":2,)"
-          R"("type":"sprite","tag":"DefineSprite","code":39,"frames":8}]})"}},
+          R"("type":"sprite","tag":"DefineSprite","code":39,"frames":8}],"streams":[]})"}},
         {"head -c 40 ../m | $vexel info --json -", {R"("bytes":40,"truncated":true,)"}},
         {"head -c 40 ../m | $vexel dump - 2>../said; cat - ../said",
          {"\n      26  incomplete: 14 bytes\n",

@@ -1,4 +1,4 @@
-// `vexel info`: header, tags, labels and characters of a movie.
+// `vexel info`: header, tags, labels, characters and streams of a movie.
 #include "tools/vexel/arguments.h"
 #include "tools/vexel/commands.h"
 #include "tools/vexel/json_writer.h"
@@ -16,6 +16,19 @@ S32 Pixels(S32 low, S32 high)
     return static_cast<S32>((static_cast<S64>(high) - low) / 20);
 }
 
+void PrintSound(U8 format, U32 samples)
+{
+    std::printf("  %s, %d Hz, %d bits, %s, %u samples", CompressionName(format), SoundRate(format),
+                SoundBits(format), SoundChannels(format) == 2 ? "stereo" : "mono", samples);
+}
+
+void PrintStream(const InfoStream& stream)
+{
+    std::printf(stream.sprite < 0 ? "   main" : "  %5d", stream.sprite);
+    PrintSound(stream.format, stream.samplesPerFrame);
+    std::printf(" a frame, %d blocks\n", stream.blocks);
+}
+
 void PrintCharacter(const InfoCharacter& c)
 {
     std::printf("  %5d  %-6s  %s", c.id, c.type, TagTitle(c.tagCode).c_str());
@@ -25,6 +38,10 @@ void PrintCharacter(const InfoCharacter& c)
         std::printf("  %dx%d pixels", c.width, c.height);
     if (c.frames != 0)
         std::printf("  %d frames", c.frames);
+    if (c.hasSound) {
+        PrintSound(c.format, c.samples);
+        std::printf(", %.3f seconds", SoundSeconds(c.format, c.samples));
+    }
     std::printf("\n");
 }
 
@@ -51,6 +68,9 @@ void PrintText(const MovieFile& file, const MovieInfo& info)
     std::printf("characters\n");
     for (const InfoCharacter& character : info.characters)
         PrintCharacter(character);
+    std::printf("streams\n");
+    for (const InfoStream& stream : info.streams)
+        PrintStream(stream);
 }
 
 void AddRect(JsonWriter* json, const SRECT& r)
@@ -72,6 +92,22 @@ void AddHeader(JsonWriter* json, const MovieFile& file, const MovieInfo& info)
     json->Key("frames").Int(movie.numFrames).Key("framesFound").Int(info.frames);
 }
 
+void AddSound(JsonWriter* json, U8 format)
+{
+    json->Key("compression").String(CompressionName(format)).Key("rate").Int(SoundRate(format));
+    json->Key("bits").Int(SoundBits(format)).Key("channels").Int(SoundChannels(format));
+}
+
+void AddStream(JsonWriter* json, const InfoStream& stream)
+{
+    json->BeginObject();
+    if (stream.sprite >= 0)
+        json->Key("sprite").Int(stream.sprite);
+    AddSound(json, stream.format);
+    json->Key("samplesPerFrame").Int(stream.samplesPerFrame);
+    json->Key("blocks").Int(stream.blocks).EndObject();
+}
+
 void AddCharacter(JsonWriter* json, const InfoCharacter& c)
 {
     json->BeginObject().Key("id").Int(c.id).Key("type").String(c.type);
@@ -84,6 +120,11 @@ void AddCharacter(JsonWriter* json, const InfoCharacter& c)
         json->Key("size").BeginArray().Int(c.width).Int(c.height).EndArray();
     if (c.frames != 0)
         json->Key("frames").Int(c.frames);
+    if (c.hasSound) {
+        AddSound(json, c.format);
+        json->Key("samples").Int(c.samples);
+        json->Key("seconds").Number(SoundSeconds(c.format, c.samples));
+    }
     json->EndObject();
 }
 
@@ -101,6 +142,9 @@ void PrintJson(const MovieFile& file, const MovieInfo& info)
     json.EndArray().Key("characters").BeginArray();
     for (const InfoCharacter& character : info.characters)
         AddCharacter(&json, character);
+    json.EndArray().Key("streams").BeginArray();
+    for (const InfoStream& stream : info.streams)
+        AddStream(&json, stream);
     json.EndArray().EndObject();
     std::puts(json.Text().c_str());
 }

@@ -3,6 +3,8 @@
 #include "core/stream/character.h"
 #include "core/stream/tags.h"
 
+#include <algorithm>
+
 namespace {
 
 constexpr int kDeepest = 16; // sprites inside sprites
@@ -61,15 +63,45 @@ bool BeginsWithBounds(S32 code)
 
 } // namespace
 
-void MovieInfo::Collect(TagReader reader, int depth)
+const char* CompressionName(U8 format)
 {
+    switch (format & kSoundCompression) {
+    case kSoundPlain:
+        return "pcm";
+    case kSoundAdpcm:
+        return "adpcm";
+    case kSoundMpeg:
+        return "mpeg";
+    case kSoundPlainLittle:
+        return "pcm-le";
+    default:
+        return "unknown";
+    }
+}
+
+int SoundBits(U8 format)
+{
+    return DecodedFormat(format) & kSound16Bit ? 16 : 8;
+}
+
+// The lowest rate is not a whole number of samples a second.
+double SoundSeconds(U8 format, U32 samples)
+{
+    return samples / (44100.0 / (1 << SoundRateShift(format)));
+}
+
+void MovieInfo::Collect(TagReader reader, int depth, int sprite)
+{
+    size_t head = 0; // the place after the last stream of this timeline; 0: none
     while (reader.Next()) {
         tags[reader.tagCode]++;
         CollectTag(&reader, depth);
+        CollectStream(&reader, sprite, &head);
         constexpr S32 kSpriteHead = 4; // id and frame count
         if (reader.tagCode == kTagDefineSprite && depth < kDeepest && reader.Length() > kSpriteHead)
             Collect(TagReader(reader.script, reader.bodyStart + kSpriteHead, reader.tagEnd),
-                    depth + 1);
+                    depth + 1,
+                    reader.script[reader.bodyStart] | reader.script[reader.bodyStart + 1] << 8);
     }
 }
 
@@ -84,6 +116,19 @@ void MovieInfo::CollectTag(TagReader* reader, int depth)
         frames++;
     else if (reader->tagCode == kTagFrameLabel && depth == 0)
         labels.push_back({frames + 1, reader->Text()});
+}
+
+void MovieInfo::CollectStream(TagReader* reader, int sprite, size_t* head)
+{
+    const S32 code = reader->tagCode;
+    if (code == kTagSoundStreamHead || code == kTagSoundStreamHead2) {
+        reader->pos = reader->bodyStart + 1;
+        const U8 format = reader->GetByte();
+        streams.push_back({sprite, format, reader->GetWord()});
+        *head = streams.size();
+    } else if (code == kTagSoundStreamBlock && *head > 0) {
+        streams[*head - 1].blocks++;
+    }
 }
 
 // As in the player the first definition of an id stands until it is freed.
@@ -105,6 +150,10 @@ void MovieInfo::Define(TagReader* reader, const char* type)
         character.height = reader->GetWord();
     } else if (code == kTagDefineSprite) {
         character.frames = reader->GetWord();
+    } else if (code == kTagDefineSound) {
+        character.hasSound = true;
+        character.format = reader->GetByte();
+        character.samples = reader->GetDWord();
     }
     characters.push_back(character);
 }

@@ -153,6 +153,13 @@ std::string SoundFields(TagReader& tag)
     return text + Format(" samples=%u", tag.GetDWord());
 }
 
+std::string StreamHeadFields(TagReader& tag)
+{
+    std::string text = Format(" playback=0x%02x", tag.GetByte());
+    text += Format(" format=0x%02x", tag.GetByte());
+    return text + WordField(tag, "samples");
+}
+
 std::string SpriteFields(TagReader& tag)
 {
     const std::string id = WordField(tag, "id");
@@ -199,6 +206,9 @@ std::string Decode(TagReader& tag)
         return FontInfoFields(tag);
     case kTagDefineSound:
         return SoundFields(tag);
+    case kTagSoundStreamHead:
+    case kTagSoundStreamHead2:
+        return StreamHeadFields(tag);
     case kTagDefineSprite:
         return SpriteFields(tag);
     case kTagDefineButtonCxform:
