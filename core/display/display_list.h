@@ -79,7 +79,7 @@ public:
     int useFocusRect = 1; // the highlight is drawn
     SButtonIdentity buttonIdentity = {};
     S32 instanceCount = 0;         // unnamed sprites placed so far
-    CSoundMix* soundMix = nullptr; // takes the sounds of buttons
+    CSoundMix* soundMix = nullptr; // takes all sounds; null: there are none
     int editTextFlag = 0;          // some text field draws with a device font
     SCharacter* pending = nullptr; // retained for a placement that waits for a removal
     U64 pixelsLeft = 0;            // of images that may be decoded for this repaint or hit test
