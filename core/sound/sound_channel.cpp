@@ -124,6 +124,12 @@ S32 CSoundChannel::ElapsedFrames() const
     return S32(std::min<S64>((samples + frame / 2) / frame, kS32Max));
 }
 
+S32 CSoundChannel::SinceHeard() const
+{
+    const U64 pair = published.load(std::memory_order_acquire);
+    return mixer ? S32((U64(mixer->Clock()) - pair) & kClockMask) : 0;
+}
+
 void CSoundChannel::Render(S16* out, U8 outFormat, S32 index, S32* budget)
 {
     const S32 frames = kSoundBufferFrames >> SoundRateShift(sound.format);

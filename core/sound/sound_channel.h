@@ -87,6 +87,8 @@ public:
     // middle on, and carried on by the clock for up to 63 ms after a buffer was completed, unless
     // the stream waits.
     S32 ElapsedFrames() const;
+    // Milliseconds since a buffer of it was completed, or since it was added.
+    S32 SinceHeard() const;
 
 private:
     friend class CSoundMix;
