@@ -58,7 +58,8 @@ struct SLimits {
     // tagsPerDraw is kept for the oldest timeline, the player's own movie, whose turn comes last:
     // it gets ahead in every tick, whatever its sprites do.
     U32 tagsPerTimeline = 256u << 10;
-    // Frames that one tick plays to catch up with a streaming sound; the rest come in the next.
+    // Frames that one tick plays to catch up with a streaming sound, at least 1; the rest come in
+    // the next.
     S32 framesPerTick = 256;
     // Levels and movies loaded beside the root.
     U32 loadedMovies = 256;

@@ -213,7 +213,10 @@ private:
     void ChooseCamera();
     void PixelCamera(MATRIX* mat) const;
     void LeaveFixedScale();
+    static bool KeepsTime(const ScriptThread* thread);
     void TopLeftView(SRECT* r);
+    void StopTicks();
+    bool FrameIsDue(S32 now) const;
     bool ShowsAt100();
     void RequestMovie(const char* url);
     void OfferWindow();

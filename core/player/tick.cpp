@@ -1,13 +1,6 @@
 // The tick: what happens when the shell's timer fires.
 #include "core/player/player.h"
 
-namespace {
-
-// Half of the clock's range: what lies less than that behind is due, the rest is yet to come.
-constexpr S32 kClockHalf = 0x4000000;
-
-} // namespace
-
 // When a stream sets the pace, the picture waits for it or catches up, and the clock has no say.
 void SPlayer::DoPlay(int checkTime)
 {
@@ -18,7 +11,7 @@ void SPlayer::DoPlay(int checkTime)
     const SoundPace pace = PaceOfSound();
     if (pace.frames < 1)
         return;
-    if (pace.thread == nullptr && checkTime && ClockElapsed(now, nextFrameTime) >= kClockHalf)
+    if (pace.thread == nullptr && checkTime && !FrameIsDue(now))
         return;
     nextFrameTime = now + frameDelay;
     scene.ResetBudget();
@@ -30,6 +23,14 @@ void SPlayer::DoPlay(int checkTime)
     UpdateScreen();
     if (autoQuality)
         AdjustQuality(ClockElapsed(PlayerClock(), now), pace.frames);
+}
+
+// Only a time that lies ahead by no more than a frame is to be waited for. Any other has passed,
+// however long ago: the clock goes around once in 37 hours.
+bool SPlayer::FrameIsDue(S32 now) const
+{
+    const S32 left = ClockElapsed(nextFrameTime, now);
+    return left == 0 || left > frameDelay;
 }
 
 // Newest first: sprites come before their parents. A timeline that starts during the walk goes to
