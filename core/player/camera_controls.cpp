@@ -1,14 +1,32 @@
 // The camera: what of the movie the client area shows.
 #include "core/player/player.h"
 
+#include <algorithm>
+
+namespace {
+
+S32 Side(S32 min, S32 max)
+{
+    return static_cast<S32>(std::clamp<S64>(static_cast<S64>(max) - min, 0, kS32Max));
+}
+
+} // namespace
+
+// What the shell says, put right: pixels are counted from the bitmap's corner.
+SRECT SPlayer::ClientArea()
+{
+    SRECT r = {};
+    ClientRect(&r);
+    return {0, Side(r.xmin, r.xmax), 0, Side(r.ymin, r.ymax)};
+}
+
 // A zoom does not show at the fixed scale; it waits until the mode is another.
 void SPlayer::ChooseCamera()
 {
-    SRECT client;
-    ClientRect(&client);
+    const SRECT client = ClientArea();
     scene.animatedMovie = numFrames > 1 && !bestQuality;
-    const bool fits = static_cast<S64>(client.xmax) - client.xmin <= CRaster::kMaxAntialiasSide &&
-                      static_cast<S64>(client.ymax) - client.ymin <= CRaster::kMaxAntialiasSide;
+    const bool fits =
+        client.xmax <= CRaster::kMaxAntialiasSide && client.ymax <= CRaster::kMaxAntialiasSide;
     const bool zoomed = IsZoomed() && scaleMode != kScaleFixed;
     scene.SetCamera(zoomed ? &zoomRect : &frame, &client, highQuality && fits, scaleMode);
 }

@@ -78,7 +78,9 @@ public:
     virtual void StopTimer() = 0;
     // Has pixel rectangle `r` of the screen redrawn later, through OnDraw or Repaint.
     virtual void InvalidateScreenArea(const SRECT* r) = 0;
-    // The drawing area in pixels, half-open.
+    // The drawing area in pixels: {0, width, 0, height}, half-open, where a side of 0 shows nothing
+    // and one above CBitBuffer::kMaxSide cannot be shown. From any other rectangle the player takes
+    // the size only.
     virtual void ClientRect(SRECT* r) = 0;
     // Offers a window size in pixels for a movie that has just been opened.
     virtual void AdjustWindow(S32 width, S32 height) = 0;
@@ -226,5 +228,6 @@ private:
 
 // The level of that number among `first` and those linked behind it, or null.
 ScriptPlayer* FindLayer(ScriptPlayer* first, S32 layer);
+    SRECT ClientArea();
 // The level number in a name like "_level3"; -1 when it is no such name.
 S32 LayerNum(const char* name);

@@ -6,7 +6,8 @@
 namespace {
 
 constexpr S32 kQuarter = 0x4000;
-constexpr S64 kTwips = 20; // in a pixel at 100%
+constexpr S64 kTwips = 20;   // in a pixel at 100%
+constexpr S64 kRounding = 4; // twips by which an inverted camera may fall short
 
 // One axis of a rectangle.
 struct Span {
@@ -63,10 +64,16 @@ S32 Scaled(S64 size, S32 factor)
     return Saturate32((Saturate32(size) * static_cast<S64>(factor)) >> 16);
 }
 
-SRECT Moved(const SRECT& r, S32 dx, S32 dy)
+// Moves one axis of a zoom, whose size stays, so that no number of small moves wears it down. Of
+// the zoom and what the scale mode makes visible of it or around it, the shorter is kept in the
+// frame to the twip.
+void MoveAxis(S32 offset, const Span& frame, const Span& visible, S32* min, S32* max)
 {
-    return {Saturate32(static_cast<S64>(r.xmin) + dx), Saturate32(static_cast<S64>(r.xmax) + dx),
-            Saturate32(static_cast<S64>(r.ymin) + dy), Saturate32(static_cast<S64>(r.ymax) + dy)};
+    const Span zoom = {*min, *max};
+    const bool inside = zoom.max - zoom.min <= visible.max - visible.min + kRounding;
+    const S64 by = CutOffset(offset, frame, inside ? zoom : visible);
+    *min = std::max(Saturate32(zoom.min + by), kRectEmpty + 1);
+    *max = Saturate32(zoom.max + by);
 }
 
 } // namespace
@@ -87,8 +94,7 @@ void SPlayer::ZoomF(S32 factor, const SPOINT* devicePoint)
     MATRIX toMovie;
     PixelCamera(&toMovie);
     MatrixInvert(&toMovie, &toMovie);
-    SRECT client;
-    ClientRect(&client);
+    const SRECT client = ClientArea();
     MatrixTransformRect(&toMovie, &client, &zoomRect);
     SPOINT centre = {Middle(zoomRect.xmin, zoomRect.xmax), Middle(zoomRect.ymin, zoomRect.ymax)};
     if (devicePoint != nullptr)
@@ -99,11 +105,10 @@ void SPlayer::ZoomF(S32 factor, const SPOINT* devicePoint)
 void SPlayer::Zoom(SPOINT size, SPOINT centre)
 {
     LeaveFixedScale();
-    SRECT client;
-    ClientRect(&client);
+    const SRECT client = ClientArea();
     // As many twips as there are pixels: no closer than one twip a pixel.
-    size.x = std::max(size.x, Saturate32(Width(client)));
-    size.y = std::max(size.y, Saturate32(Height(client)));
+    size.x = std::max(size.x, client.xmax);
+    size.y = std::max(size.y, client.ymax);
     const Span x = SpanWithin(size.x, centre.x, {frame.xmin, frame.xmax});
     const Span y = SpanWithin(size.y, centre.y, {frame.ymin, frame.ymax});
     const bool nothing = x.min >= x.max || y.min >= y.max;
@@ -124,20 +129,28 @@ void SPlayer::ZoomScale(S32 percent)
         ZoomF(FixedDiv(100, percent), nullptr);
 }
 
+// The zoom is moved by twips that come from the exact camera; the one in pixels is cut off and says
+// only what may be moved.
 void SPlayer::Pan(S32 dx, S32 dy)
 {
-    if (!IsZoomed())
-        return;
+    if (!IsZoomed() || scaleMode == kScaleFixed)
+        return; // the view shows no zoom
     MATRIX camera;
     PixelCamera(&camera);
-    SRECT shown, client;
+    const SRECT client = ClientArea();
+    SRECT shown, view;
     MatrixTransformRect(&camera, &frame, &shown);
-    ClientRect(&client);
     dx = CutOffset(dx, {shown.xmin, shown.xmax}, {client.xmin, client.xmax});
     dy = CutOffset(dy, {shown.ymin, shown.ymax}, {client.ymin, client.ymax});
-    const SRECT moved = Moved(client, dx, dy);
+    if (dx == 0 && dy == 0)
+        return;
     MatrixInvert(&camera, &camera);
-    MatrixTransformRect(&camera, &moved, &zoomRect);
+    MatrixTransformRect(&camera, &client, &view);
+    const S64 unit = scene.antialias ? 4 * 0x10000 : 0x10000;
+    MoveAxis(ScaleByRatio(dx, unit, scene.camera.a), {frame.xmin, frame.xmax},
+             {view.xmin, view.xmax}, &zoomRect.xmin, &zoomRect.xmax);
+    MoveAxis(ScaleByRatio(dy, unit, scene.camera.d), {frame.ymin, frame.ymax},
+             {view.ymin, view.ymax}, &zoomRect.ymin, &zoomRect.ymax);
     SetCamera(1);
 }
 
@@ -154,7 +167,8 @@ void SPlayer::SetZoomRect(S32 xmin, S32 ymin, S32 xmax, S32 ymax)
         Home();
         return;
     }
-    zoomRect = {xmin, xmax, ymin, ymax};
+    // The least number there is would say that the rectangle is empty.
+    zoomRect = {std::max(xmin, kRectEmpty + 1), xmax, ymin, ymax};
     SetCamera(2);
 }
 
@@ -166,9 +180,10 @@ void SPlayer::LeaveFixedScale()
 
 void SPlayer::TopLeftView(SRECT* r)
 {
-    SRECT client;
-    ClientRect(&client);
-    *r = {0, Saturate32(Width(client) * kTwips), 0, Saturate32(Height(client) * kTwips)};
+    const SRECT client = ClientArea();
+    *r = {0, Saturate32(client.xmax * kTwips), 0, Saturate32(client.ymax * kTwips)};
+    if (r->xmax == 0 || r->ymax == 0)
+        RectSetEmpty(r);
 }
 
 bool SPlayer::ShowsAt100()
