@@ -125,7 +125,7 @@ public:
 
     // --- screen ---
     // Makes sure the screen bitmap exists; with `paint` brings it up to date. False when it cannot
-    // exist.
+    // exist, which is remembered for that size until FreeBuffer or ClearScript.
     bool UpdateBuffer(int paint);
     // Paints what changed and copies it to the screen.
     void UpdateScreen();
@@ -209,7 +209,8 @@ private:
     void RetestButtons();
     void AdjustQuality(S32 elapsed, S32 framesPlayed);
     ScriptPlayer* NewLayer(S32 layer);
-    bool CreateBits(const SRECT* client);
+    bool CreateBits(S32 width, S32 height);
+    bool AllocateBits(S32 width, S32 height);
     void TakeDirty();
     void BlitPending();
     void ChooseCamera();
@@ -231,3 +232,6 @@ ScriptPlayer* FindLayer(ScriptPlayer* first, S32 layer);
     SRECT ClientArea();
 // The level number in a name like "_level3"; -1 when it is no such name.
 S32 LayerNum(const char* name);
+
+    SPOINT refusedSize = {}; // of a screen bitmap that cannot be had; 0 by 0: none is known
+    bool painting = false;

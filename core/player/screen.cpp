@@ -5,37 +5,47 @@
 bool SPlayer::UpdateBuffer(int paint)
 {
     if (!bits.HasBits()) {
-        SRECT client;
-        ClientRect(&client);
-        if (client.xmin >= client.xmax || client.ymin >= client.ymax)
+        const SRECT client = ClientArea();
+        if (client.xmax == 0 || client.ymax == 0)
             return true;
-        if (!CreateBits(&client))
+        if (!CreateBits(client.xmax, client.ymax))
             return false;
     }
-    if (paint)
+    if (paint) {
+        painting = true;
         scene.Update();
+        painting = false;
+    }
     return true;
 }
 
-bool SPlayer::CreateBits(const SRECT* client)
+// What cannot be had is not asked for in every tick, at the cost of all that is cached.
+bool SPlayer::CreateBits(S32 width, S32 height)
 {
-    const S64 width = static_cast<S64>(client->xmax) - client->xmin;
-    const S64 height = static_cast<S64>(client->ymax) - client->ymin;
-    if (width > CBitBuffer::kMaxSide || height > CBitBuffer::kMaxSide ||
-        width * height > gLimits.surfacePixels)
+    if (width == refusedSize.x && height == refusedSize.y)
         return false;
-    const S32 w = static_cast<S32>(width), h = static_cast<S32>(height);
-    if (!bits.CreateScreenBits(w, h, screenFormat)) {
-        // Memory is short: what can be made again goes before the screen does.
-        scene.FreeCache();
-        FreeCache();
-        if (!bits.CreateScreenBits(w, h, screenFormat))
-            return false;
+    if (!AllocateBits(width, height)) {
+        refusedSize = {width, height};
+        return false;
     }
+    const SRECT whole = {0, width, 0, height};
     ChooseCamera();
     scene.ModifyCamera();
-    InvalidateScreenArea(client);
+    InvalidateScreenArea(&whole);
     return true;
+}
+
+bool SPlayer::AllocateBits(S32 width, S32 height)
+{
+    if (width > CBitBuffer::kMaxSide || height > CBitBuffer::kMaxSide ||
+        static_cast<S64>(width) * height > gLimits.surfacePixels)
+        return false;
+    if (bits.CreateScreenBits(width, height, screenFormat))
+        return true;
+    // Memory is short: what can be made again goes before the screen does.
+    scene.FreeCache();
+    FreeCache();
+    return bits.CreateScreenBits(width, height, screenFormat);
 }
 
 // Adds what is waiting to be painted and what has been painted to what the screen still lacks.
@@ -108,6 +118,7 @@ void SPlayer::OnDraw(const SRECT* exposed)
 void SPlayer::FreeBuffer()
 {
     bits.FreeBits();
+    refusedSize = {};
     scene.InvalidateRect(&scene.devViewRect);
 }
 
