@@ -42,21 +42,33 @@ SPlayer::~SPlayer()
 
 void SPlayer::Run()
 {
-    if (running)
+    suspended = 0;
+    StartTicks();
+}
+
+// Before the first frame is there nobody knows how fast to tick: the loader calls this then.
+void SPlayer::StartTicks()
+{
+    if (suspended)
+        SilenceThreads(); // the first frame may have started sounds
+    if (running || suspended || !loaded)
         return;
     // Only a negative quotient is corrected: very fast movies ask for an interval of 0.
     const S32 interval = frameDelay / kTimerShare;
-    if (!StartTimer(interval < 0 ? 1 : interval, kCursorInterval))
-        return;
-    running = 1;
     nextFrameTime = PlayerClock();
+    running = StartTimer(interval < 0 ? 1 : interval, kCursorInterval);
 }
 
 void SPlayer::Suspend()
 {
-    if (!running)
-        return;
-    if (!sharedTimer)
+    suspended = 1;
+    StopTicks();
+}
+
+// Sounds may play without ticks too: those of the first frame, and of one that was gone to.
+void SPlayer::StopTicks()
+{
+    if (running && !sharedTimer)
         StopTimer();
     running = 0;
     SilenceThreads();
@@ -64,10 +76,12 @@ void SPlayer::Suspend()
 
 void SPlayer::ClearScript()
 {
-    Suspend();
+    StopTicks();
     FreeLayers();
     RectSetEmpty(&zoomRect);
     loaded = 0;
+    slowTicks = fastTicks = sampledTicks = 0;
+    refusedSize = {}; // there is memory again
     if (hostCamera)
         return;
     SetCamera(2);

@@ -40,7 +40,7 @@ public:
     int autoQuality = 0;            // DoPlay may switch the quality by measured speed
     int qualityHold = 1000;         // ticks since the last automatic switch
     int bestQuality = 0;            // bitmaps stay smoothed in animated movies
-    int slowTicks = 0;
+    int slowTicks = 0;              // this and the next two: measured since the movie was opened
     int fastTicks = 0;
     int sampledTicks = 0;
     S32 scaleMode = 0;       // SScaleMode bits and kScaleTopLeft100
@@ -52,6 +52,7 @@ public:
     int loaded = 0;                  // the first frame can be shown
     int running = 0;                 // the shell's timer runs
     int mouseState = -1;             // of the last mouse event: 0 up, 1 down; -1: not known
+    int suspended = 0;               // Suspend was called and Run not since then
     SPOINT mousePt = {};             // where it was, in pixels
     S32 startTime = 0;               // clock value at construction
     int firstLoad = 0;               // the next stream that opens is the movie of ControlOpen
@@ -64,8 +65,10 @@ public:
     static CSoundMix* theSoundMix;
     int soundOn = 1;         // sounds are started
     S32 soundBufferTime = 5; // seconds of lead that a streaming sound wants when data runs out
-    int sharedTimer = 0;     // the timer serves others too: Suspend leaves it running
-    int hostCamera = 0;      // the host sets the camera: ClearScript leaves it alone
+    // The timer serves others too: Suspend leaves it running, and its owner ticks only those
+    // players whose `running` is on.
+    int sharedTimer = 0;
+    int hostCamera = 0; // the host sets the camera: ClearScript leaves it alone
 
     SPlayer();
     ~SPlayer() override;
@@ -73,7 +76,8 @@ public:
     // --- what the shell supplies ---
     // Starts calling DoPlay(1) every `interval` ms (0: as often as every millisecond) and
     // UpdateCursor every `cursorInterval` ms, never nested in another player call. False when no
-    // timer can be had.
+    // timer can be had: the player is not `running` then and stands still, until Run is called
+    // again or the shell ticks it by itself; a frame is due at once.
     virtual bool StartTimer(S32 interval, S32 cursorInterval) = 0;
     virtual void StopTimer() = 0;
     // Has pixel rectangle `r` of the screen redrawn later, through OnDraw or Repaint.
@@ -107,10 +111,14 @@ public:
     // Advances every timeline by one frame if one is due (always, when `checkTime` is off), or by
     // as many as a streaming sound asks for, and repaints.
     void DoPlay(int checkTime);
-    // Starts and stops the ticks; a stopped player is silent.
+    // Suspend stops the ticks and silences the player, Run starts the ticks. Before the first frame
+    // can be shown both are remembered: the ticks start with that frame, unless the player is
+    // suspended. A suspension outlasts the movie.
     void Run();
     void Suspend();
     // Runs the queued actions.
+    // For the loader, when the first frame is there: the ticks start unless it is suspended.
+    void StartTicks();
     void DoActions();
 
     // --- levels ---

@@ -17,7 +17,8 @@ void SPlayer::SetQuality(int level)
     SetCamera(2);
 }
 
-// The three counts are never set back: the rule works on all ticks since the movie was opened.
+// The three counts are not set back by a switch: the rule works on all ticks since the movie was
+// opened.
 void SPlayer::AdjustQuality(S32 elapsed, S32 framesPlayed)
 {
     if (elapsed > frameDelay || framesPlayed >= 2)

@@ -153,7 +153,7 @@ void ScriptPlayer::PushDataComplete()
         splayer->loaded = 1;
         if (numFrames < 2 && splayer->autoQuality)
             splayer->highQuality = 1;
-        splayer->Run();
+        splayer->StartTicks();
         splayer->DoActions();
     }
     splayer->SetCamera(2);
