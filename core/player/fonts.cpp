@@ -5,7 +5,7 @@
 
 bool SPlayer::LoadBuiltInFonts()
 {
-    if (fontState != kFontsUntried)
+    if (fontState != kFontsUntried || painting)
         return fontState == kFontsLoaded;
     U8* data = nullptr;
     S32 size = 0;
@@ -17,11 +17,14 @@ bool SPlayer::LoadBuiltInFonts()
     return fontState == kFontsLoaded;
 }
 
-// Its tags define the fonts, once, whatever is left of the tick's budget; nothing of it is shown,
-// and it stands still from then on.
+// Its tags define the fonts, once, whatever is left of the tick's budget; nothing of it is seen or
+// heard, the background stays, and it stands still from then on.
 void SPlayer::RunFontMovie(const U8* data, S32 size)
 {
     const U32 tagsLeft = scene.tagsLeft;
+    const int priority = scene.backgroundPriority, sound = soundOn;
+    scene.backgroundPriority = kS32Max;
+    soundOn = 0;
     fontPlayer.splayer = this;
     fontPlayer.display = &scene;
     fontPlayer.layerNum = kFontLayer;
@@ -33,4 +36,6 @@ void SPlayer::RunFontMovie(const U8* data, S32 size)
     fontPlayer.StopPlay();
     scene.RemoveThisObject(fontPlayer.rootObject);
     scene.tagsLeft = tagsLeft;
+    scene.backgroundPriority = priority;
+    soundOn = sound;
 }

@@ -53,7 +53,7 @@ ScriptPlayer* SPlayer::OpenLayer(S32 layer, int keep)
 
 ScriptPlayer* SPlayer::NewLayer(S32 layer)
 {
-    if (layer < 0 || CountLayers(layers) >= gLimits.loadedMovies)
+    if (layer < 0 || layer > kLastLayer || CountLayers(layers) >= gLimits.loadedMovies)
         return nullptr;
     ScriptPlayer* movie = new (std::nothrow) ScriptPlayer;
     if (movie == nullptr)

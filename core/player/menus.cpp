@@ -1,5 +1,6 @@
 // What the shell's menus show.
 #include "core/player/player.h"
+#include "core/stream/movie_data.h"
 #include "core/stream/tags.h"
 
 #include <cstring>
@@ -18,12 +19,16 @@ void Mask(const MenuStatus& mask, MenuStatus* status)
     std::memcpy(status, entries, sizeof entries);
 }
 
-// By the header's count of frames, unless there is nothing more to run: that count may be wrong.
-bool CanAdvance(const ScriptThread& timeline)
+// By the header's count of frames, unless all data is there and nothing more to run in it: that
+// count may be wrong.
+bool CanAdvance(const ScriptPlayer& movie)
 {
-    STagWalker next(timeline, timeline.pos);
-    return !timeline.atEnd && timeline.curFrame < timeline.numFrames - 1 &&
-           next.GetTag(timeline.len) > kTagEnd;
+    if (movie.atEnd || movie.curFrame >= movie.numFrames - 1)
+        return false;
+    STagWalker next(movie, movie.pos);
+    const S32 code = next.GetTag(movie.len);
+    const bool loading = movie.sharedScript && !movie.sharedScript->NothingMore();
+    return code > kTagEnd || (code < 0 && loading);
 }
 
 } // namespace

@@ -27,6 +27,7 @@ public:
     // Added to a scale mode: Control100 shows the movie's top left corner, by a zoom.
     static constexpr S32 kScaleTopLeft100 = 0x1000;
     static constexpr S32 kFontLayer = 16000; // layer number of fontPlayer
+    static constexpr S32 kLastLayer = 65535; // a level's number is the depth at which it lies
     // Factors of ZoomF.
     static constexpr S32 kZoomIn = 0x8000;
     static constexpr S32 kZoomOut = 0x20000;
@@ -123,7 +124,7 @@ public:
 
     // --- levels ---
     // The movie of a level, made when absent; cleared first unless `keep`. Null when it cannot be
-    // had.
+    // had: no memory, too many levels, or a number that is none from 0 to kLastLayer.
     ScriptPlayer* OpenLayer(S32 layer, int keep);
     void ClearLayer(S32 layer);
     void FreeLayers();
@@ -199,7 +200,9 @@ public:
     void SetMenuState(const MenuStatus& mask);
 
     // --- fonts ---
-    // Has the built-in fonts defined in fontPlayer; false when there are none. Tried once.
+    // Has the built-in fonts defined in fontPlayer; false when there are none. Tried once. Runs
+    // tags, which place and remove objects: whoever walks the scene must have asked before; inside
+    // a paint nothing is tried.
     bool LoadBuiltInFonts();
 
 private:
