@@ -50,6 +50,7 @@ void NativePlayerWnd::Feed(const U8* data, size_t n)
 {
     while (n > 0) {
         const size_t block = n < kLargestBlock ? n : kLargestBlock;
+        sizeReported = sizeReported && gotHeader; // of the movie before this one
         PushDataBuf(data, static_cast<S32>(block));
         if (gotHeader && !sizeReported) {
             sizeReported = true;
@@ -141,8 +142,8 @@ void NativePlayerWnd::AdjustWindow(S32 pixelWidth, S32 pixelHeight)
 {
     if (!ownSize)
         return;
-    width = pixelWidth;
-    height = pixelHeight;
+    width = pixelWidth < 0 ? 0 : pixelWidth;
+    height = pixelHeight < 0 ? 0 : pixelHeight;
     FreeBuffer();
 }
 
