@@ -1,3 +1,4 @@
+#include "platform/headless/headless_sound.h"
 #include "tests/player/player_scene.h"
 #include "tests/support/glyph_writer.h"
 
@@ -48,6 +49,22 @@ TEST(Controls, StepThroughTheMovieWithTheMenus)
     EXPECT_FALSE(player.scene.antialias || player.autoQuality || player.menu.canPlay);
 }
 
+// What is not there yet may come, unless the stream has ended without it.
+TEST(Controls, ForwardWhileLoading)
+{
+    const std::vector<U8> movie = MovingSquare(3);
+    std::string possible;
+    for (const size_t missing : {movie.size() - 15, size_t(30), size_t(5), size_t(0)}) {
+        NativePlayerWnd player(0, 0);
+        player.Feed(movie.data(), movie.size() - missing);
+        for (MenuStatus menu : {MenuStatus(), MenuStatus()}) {
+            player.GetMenuState(&menu), player.EndOfData();
+            possible += std::to_string(menu.canForward);
+        }
+    }
+    EXPECT_EQ("00101111", possible);
+}
+
 // The host's flags; then without them.
 TEST(Controls, OpenAndClose)
 {
@@ -61,11 +78,13 @@ TEST(Controls, OpenAndClose)
     player.answer = movie.Bytes();
     player.ControlOpen("a movie");
     EXPECT_TRUE(player.TimerRuns() && !player.running && !player.IsZoomed());
-    EXPECT_TRUE(player.scene.camera.a == scale && player.Width() == 38 && player.Height() == -2);
+    EXPECT_TRUE(player.scene.camera.a == scale && player.Width() == 38 && player.Height() == 0);
     player.sharedTimer = player.hostCamera = 0;
-    player.Run();
+    player.PushDataComplete();
     player.ControlClose();
     EXPECT_FALSE(player.TimerRuns() || player.menu.canBack || player.scene.camera.a == scale);
+    player.Feed(MovingSquare(2).data(), 30);
+    EXPECT_EQ(100, player.Width()) << "each movie its own size";
 }
 
 // A frame of 2000 x 1600 twips on 100 x 80 pixels. Half of the view around its middle, within the
@@ -98,6 +117,36 @@ TEST(Zoom, StaysWithinTheFrame)
     }
 }
 
+// However often it moves a zoom keeps its size, and its place when it moves to and fro; it comes to
+// rest a pixel from the frame's side at most. What the scale mode adds or cuts away counts with
+// what is visible. At the fixed scale it waits.
+TEST(Zoom, PansWithoutLoss)
+{
+    const SRECT start = {301, 1304, 401, 1203}, last = {997, 2000, 798, 1600};
+    const SRECT down = {500, 1500, 50, 450}, left = {-750, 1250, 600, 1000};
+    for (int quality : {0, 1}) {
+        PlayingShell player(MovingSquare(3), 100, 80);
+        player.SetQuality(quality);
+        player.zoomRect = start;
+        player.SetCamera(2);
+        for (int i = 0; i < 200; i++)
+            i % 2 ? player.Pan(-3, 2) : player.Pan(3, -2);
+        EXPECT_TRUE(RectEqual(&start, &player.zoomRect, 0));
+        player.Pan(kS32Max, kS32Max), player.Pan(9, 9);
+        const SRECT& z = player.zoomRect;
+        EXPECT_TRUE(RectEqual(&last, &z, 10) && z.xmax <= 2000 && z.ymax <= 1600);
+        player.scaleMode = kScaleFixed;
+        player.Pan(kS32Min, kS32Min);
+        EXPECT_GT(z.xmin, 900);
+        player.scaleMode = kScaleShowAll;
+        player.SetZoomRect(500, 0, 1500, 400), player.Pan(0, 5);
+        EXPECT_TRUE(RectEqual(&down, &z, 0));
+        player.scaleMode = kScaleFill;
+        player.SetZoomRect(0, 600, 2000, 1000), player.Pan(-999, 0);
+        EXPECT_TRUE(RectEqual(&left, &z, 5)) << z.xmin;
+    }
+}
+
 // 100% is a scale of its own, during which a zoom waits; or a zoom to the top left corner.
 TEST(Zoom, And100Percent)
 {
@@ -110,22 +159,38 @@ TEST(Zoom, And100Percent)
     player.scaleMode = SPlayer::kScaleTopLeft100;
     player.Control100();
     EXPECT_TRUE(player.zoomRect.xmax == 1000 && player.zoomRect.ymax == 800 && player.menu.view100);
+    player.SetZoomRect(kS32Min, 0, 100, 80);
+    EXPECT_TRUE(player.IsZoomed());
+    ToldShell nowhere(MovingSquare(3), 50, 0);
+    nowhere.scaleMode = SPlayer::kScaleTopLeft100;
+    nowhere.Control100();
+    EXPECT_FALSE(nowhere.IsZoomed() || nowhere.menu.view100);
 }
 
-// The movie of the fonts is run once and asked for once, and nothing of it is seen or plays on.
+// The movie of the fonts is run once and asked for once, and nothing of it is seen, heard or plays
+// on.
 TEST(Fonts, AreDefinedOnce)
 {
     MovieWriter movie;
+    movie.Background({9, 9, 9, 255})
+        .Raw(14, ByteWriter().PutU16(3).PutBytes({14, 1, 0, 0, 0, 7, 7}));
+    movie.Raw(15, ByteWriter().PutU16(3).PutU8(0));
     movie.Show().Raw(kTagDefineFont2, Font2Body(7, {Square()}, {.name = "_sans", .codes = {65}}));
     movie.Show(2).End();
     for (bool available : {true, false}) {
-        ToldShell player(MovingSquare(9));
+        NativeSoundMix mix;
+        MovieWriter plain;
+        plain.Show(9);
+        ToldShell player(plain.Bytes());
+        player.scene.soundMix = &mix;
         player.answer = available ? movie.Bytes() : std::vector<U8>();
         player.scene.tagsLeft = 0;
         EXPECT_EQ(available * 2, player.LoadBuiltInFonts() + player.LoadBuiltInFonts());
         player.DoPlay(0);
         EXPECT_EQ(available, player.fontPlayer.FindCharacter(7) && player.fontPlayer.curFrame == 2);
         EXPECT_EQ(nullptr, player.fontPlayer.rootObject);
+        EXPECT_FALSE(mix.IsDeviceOpen() || player.scene.backgroundColor.red == 9 ||
+                     !player.soundOn);
     }
 }
 

@@ -4,23 +4,25 @@
 namespace {
 
 // The first tick is due when the movie starts; a late one is not made up for. The clock ends and
-// starts over between the fourth and the fifth.
+// starts over between the fourth and the fifth. A day without ticks is a long time, but no time
+// ahead.
 TEST(Tick, PlaysOneFrameWheneverOneIsDue)
 {
     SetHeadlessClock((0x7FFFFFF - 149) * S64(1000));
     PlayingShell player(MovingSquare(40));
-    const std::pair<S64, S32> steps[] = {{0, 1},    {99, 1}, {1, 2}, {1, 2},  {99, 3}, {99, 3},
-                                         {1000, 4}, {99, 4}, {5, 5}, {96, 5}, {4, 6}};
+    const std::pair<S64, S32> steps[] = {{0, 1},  {99, 1},       {1, 2},  {1, 2}, {99, 3},
+                                         {99, 3}, {1000, 4},     {99, 4}, {5, 5}, {96, 5},
+                                         {4, 6},  {86400000, 7}, {99, 7}, {1, 8}};
     for (const auto& [milliseconds, frame] : steps) {
         AdvanceHeadlessClock(milliseconds * 1000);
         player.DoPlay(1);
         EXPECT_EQ(frame, player.curFrame);
     }
     player.DoPlay(0);
-    EXPECT_EQ(7, player.curFrame) << "without the clock";
+    EXPECT_EQ(9, player.curFrame) << "without the clock";
     player.actionDepth = 1;
     player.DoPlay(0);
-    EXPECT_EQ(7, player.curFrame) << "while actions run";
+    EXPECT_EQ(9, player.curFrame) << "while actions run";
 }
 
 TEST(Tick, TimerFiresTenTimesAFrame)
@@ -52,6 +54,8 @@ TEST(Tick, QualityFollowsTheSpeed)
     EXPECT_EQ((std::vector<int>{5, 16, 38}), switches);
     player.SetQuality(1);
     EXPECT_EQ(0, player.autoQuality);
+    player.ControlClose();
+    EXPECT_EQ(0, player.sampledTicks | player.slowTicks | player.fastTicks) << "of another movie";
 }
 
 TEST(Levels, NamesGiveNumbers)
@@ -78,6 +82,7 @@ TEST(Levels, AreMadeClearedAndLimited)
     EXPECT_EQ(&player, player.scene.threadCursor);
     EXPECT_EQ(two, player.layers);
     EXPECT_EQ(nullptr, player.OpenLayer(-1, 0));
+    EXPECT_EQ(nullptr, player.OpenLayer(65536, 0)) << "would lie where level 0 does";
     EXPECT_EQ(&player, player.OpenLayer(0, 0));
     EXPECT_FALSE(player.Started() || player.TimerRuns() || player.layers != nullptr);
     gLimits = {};
@@ -164,6 +169,46 @@ TEST(Screen, SizeAndQualityDecide)
         EXPECT_EQ(c.animated, player.scene.animatedMovie) << c.width << "x" << c.height;
     }
     gLimits = {};
+}
+
+struct AreaShell : PlayingShell {
+    using PlayingShell::PlayingShell;
+    void ClientRect(SRECT* r) override { *r = area; }
+    SRECT area = {-30, 70, 500, 580};
+};
+
+// What cannot be had is asked for again with the buffer freed, or when its size changes.
+TEST(Screen, RefusedPixels)
+{
+    AreaShell player(MovingSquare(2));
+    std::string made;
+    const std::tuple<U32, S32, bool> steps[] = {
+        {1, 70, 0}, {20000, 70, 0}, {20000, 70, 1}, {20000, 999, 1}, {20000, 80, 0}};
+    for (const auto& [limit, right, freed] : steps) {
+        gLimits.surfacePixels = limit, player.area.xmax = right;
+        freed ? player.FreeBuffer() : void();
+        made += std::to_string(player.UpdateBuffer(1));
+    }
+    gLimits = {};
+    EXPECT_EQ("00101", made);
+}
+
+// A shell whose area does not begin at 0, or runs backwards.
+TEST(Screen, OnlyTheSizeOfTheClientCounts)
+{
+    AreaShell player(MovingSquare(3));
+    PlayingShell normal(MovingSquare(3));
+    for (auto zoom : {&SPlayer::Home, &SPlayer::ControlZoomIn, &SPlayer::Control100}) {
+        for (SPlayer* p : {static_cast<SPlayer*>(&player), static_cast<SPlayer*>(&normal)})
+            (p->*zoom)();
+        EXPECT_EQ("", ExpectSame(Shot(&player), Shot(&normal), "client"));
+    }
+    for (const SRECT& area : {SRECT{kS32Max, kS32Min, 0, 80}, SRECT{0, 100, 3, 2}}) {
+        player.area = area;
+        player.FreeBuffer();
+        player.ControlZoomIn();
+        EXPECT_TRUE(player.UpdateBuffer(1) && !player.bits.HasBits());
+    }
 }
 
 } // namespace
