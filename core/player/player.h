@@ -52,8 +52,8 @@ public:
     S32 nextFrameTime = 0;           // clock value at which the next frame is due
     int loaded = 0;                  // the first frame can be shown
     int running = 0;                 // the shell's timer runs
-    int mouseState = -1;             // of the last mouse event: 0 up, 1 down; -1: not known
     int suspended = 0;               // Suspend was called and Run not since then
+    int mouseState = -1;             // of the last mouse event: 0 up, 1 down; -1: not known
     SPOINT mousePt = {};             // where it was, in pixels
     S32 startTime = 0;               // clock value at construction
     int firstLoad = 0;               // the next stream that opens is the movie of ControlOpen
@@ -117,9 +117,9 @@ public:
     // suspended. A suspension outlasts the movie.
     void Run();
     void Suspend();
-    // Runs the queued actions.
     // For the loader, when the first frame is there: the ticks start unless it is suspended.
     void StartTicks();
+    // Runs the queued actions.
     void DoActions();
 
     // --- levels ---
@@ -213,7 +213,10 @@ private:
     };
 
     SoundPace PaceOfSound() const;
+    static bool KeepsTime(const ScriptThread* thread);
     bool WaitsForSound(const ScriptThread* thread) const;
+    void StopTicks();
+    bool FrameIsDue(S32 now) const;
     void SilenceThreads();
     void TendSounds();
     void AdvanceThreads(const ScriptThread* pace);
@@ -225,24 +228,21 @@ private:
     void TakeDirty();
     void BlitPending();
     void ChooseCamera();
+    SRECT ClientArea();
     void PixelCamera(MATRIX* mat) const;
     void LeaveFixedScale();
-    static bool KeepsTime(const ScriptThread* thread);
     void TopLeftView(SRECT* r);
-    void StopTicks();
-    bool FrameIsDue(S32 now) const;
     bool ShowsAt100();
     void RequestMovie(const char* url);
     void OfferWindow();
     void RefreshMenus();
     void RunFontMovie(const U8* data, S32 size);
+
+    SPOINT refusedSize = {}; // of a screen bitmap that cannot be had; 0 by 0: none is known
+    bool painting = false;
 };
 
 // The level of that number among `first` and those linked behind it, or null.
 ScriptPlayer* FindLayer(ScriptPlayer* first, S32 layer);
-    SRECT ClientArea();
 // The level number in a name like "_level3"; -1 when it is no such name.
 S32 LayerNum(const char* name);
-
-    SPOINT refusedSize = {}; // of a screen bitmap that cannot be had; 0 by 0: none is known
-    bool painting = false;
