@@ -19,7 +19,7 @@ size_t Blocks(U32 items, int perBlock)
 } // namespace
 
 DisplayList::DisplayList()
-    : root{}, backgroundColor(kWhite), dirtyArea{}, dirtyList{},
+    : root{}, backgroundColor(kWhite), dirtyArea{}, dirtyList{}, soundTag(NewSoundTag()),
       edgeAlloc(sizeof(REdge), kEdgesPerBlock, 1, 0x22222222),
       objectAlloc(sizeof(SObject), kObjectsPerBlock, 1, 0x55555555),
       colorAlloc(sizeof(RColor), kColorsPerBlock, 1, 0x44444444),

@@ -2,6 +2,8 @@
 // rectangles that the raster repaints.
 #pragma once
 
+#include "core/display/action_list.h"
+#include "core/display/object_ref.h"
 #include "core/display/place_info.h"
 #include "core/display/sobject.h"
 #include "core/geom/chunk_alloc.h"
@@ -10,6 +12,8 @@
 #include "core/raster/raster.h"
 
 class CSoundMix;
+class SPlayer;
+struct SButtonRecord;
 class ScriptPlayer;
 class ScriptThread;
 
@@ -73,8 +77,13 @@ public:
     ScriptThread* threads = nullptr; // every live timeline, newest first
     ScriptThread* threadCursor =
         nullptr;               // next thread of the tick's walk; kept valid by RemoveThread
-    SObject* button = nullptr; // the button that the pointer tracks
-    int buttonState = 0;
+    SPlayer* splayer = nullptr; // whose list it is; null: no player
+    ActionList actions;         // blocks that wait for DoActions
+    SCallTable calls;           // what is running them
+    SObject* button = nullptr;  // the button that the pointer tracks
+    int buttonState = 1;        // of that button: 1 idle, 2 over, 3 down, 4 down outside
+    int textUnderMouse = 0;     // the pointer is over a text field that can be selected in
+    const U64 soundTag;         // of the sounds that buttons start; never used again
     SRECT tabFocusRect;   // of the keyboard focus highlight; empty when none
     int useFocusRect = 1; // the highlight is drawn
     SButtonIdentity buttonIdentity = {};
@@ -156,8 +165,21 @@ public:
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
-    // The topmost object of any kind under `pt` (device units), or null.
+    // The topmost object of any kind under `pt` (pixels), or null.
     SObject* HitTest(const SPOINT* pt);
+    // The topmost button or selectable text field under `pt` (pixels), or null; null outside the
+    // view.
+    SObject* HitButton(const SPOINT* pt);
+
+    // Shows the images of a button's new state. Nothing for what is no button or is in that state.
+    void UpdateButton(SObject* obj, int newState);
+    // The pointer is over button `hit` (null: over none), pressed or not: all transitions that
+    // follow, their actions queued. True when there was one.
+    bool SetButton(SObject* hit, int mouseDown);
+    // Forces transition `code` (0 to 8) on a button.
+    void DoButtonStateTransition(SObject* obj, int code);
+    // Queues the actions and starts the sound of a transition.
+    void DoButtonAction(SObject* obj, int code);
 
     // Allows the next tick its full number of tags.
     void ResetBudget();
@@ -173,6 +195,7 @@ public:
 
 private:
     friend struct SObject;
+    friend class ObjectRef;
 
     bool MayPlace(const SObject* parent, const SCharacter* character) const;
     SObject** FindLink(SObject* parent, U16 depth);
@@ -187,6 +210,11 @@ private:
     ScriptPlayer* CloneMovie(const SCharacter* character);
     void NoteMask(const SObject* mask);
     void Empty(SObject* obj);
+    void PlaceButtonChild(SObject* obj, const SButtonRecord& record);
+    void ChangeButton(SObject* obj, int newState, int code);
+    void TrackButton(SObject* obj);
+    void StartButtonSound(SObject* obj, int slot);
+    void ClearRefs(const SObject* obj);
     SObject* Unlink(SObject** link);
     void Discard(SObject* obj);
     bool KeepsOld(const SObject* old, const SObject* fresh) const;
@@ -199,6 +227,7 @@ private:
     void PaintFocus(RColor* color, REdge** edges);
     void FreeEdges(REdge* edges);
 
+    ObjectRef* refs = nullptr; // all that point at objects of this list
     U32 nextSerial = 1;
     U32 holdSerial = 0; // objects of this serial and above were placed during the hold
     S32 openMasks = 0;  // masks whose range is being drawn now

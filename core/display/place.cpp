@@ -238,6 +238,7 @@ void DisplayList::Discard(SObject* obj)
     obj->FreeChildren();
     if (button == obj)
         button = nullptr;
+    ClearRefs(obj);
     obj->Free();
     *obj->aliveLink = obj->nextAlive;
     if (obj->nextAlive)

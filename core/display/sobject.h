@@ -82,6 +82,10 @@ struct SObject {
     // Sets `hit` to the topmost object of this subtree under `pt`; leaves it alone when there is
     // none.
     void HitTest(SObject*& hit, STransform xform, const SPOINT* pt);
+    // Sets `hit` to the topmost button or selectable text field of this subtree under `pt`.
+    void HitButton(SObject*& hit, STransform xform, const SPOINT* pt);
+    // Device bounds of a button's hit area; empty for what is no button or has none.
+    void CalcButtonBounds(SRECT* r);
     // For a mask: the next sibling when `pt` is inside it, else the first sibling beyond its range.
     SObject* HitClipper(const STransform* parentXform, const SPOINT* pt);
 

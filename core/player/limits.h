@@ -65,6 +65,19 @@ struct SLimits {
     U32 loadedMovies = 256;
     // Sounds that play at once, of which the oldest 8 are heard. Further ones do not start.
     U32 soundChannels = 64;
+    // Values on the stack of a player's scripts. One more counts as a script that ran away.
+    U32 stackValues = 65536;
+    // Records that the scripts of one player execute in one go (skipped ones count), and the work
+    // that these may cause: a record is 1, as are 16 bytes of text handled and an object looked at.
+    // Beyond either no script runs until the movie is unloaded.
+    U32 actionsPerRun = 200000;
+    U32 workPerRun = 1u << 28;
+    // Streams that feed one player at once, and requests that it may make in a second. Further
+    // requests are refused.
+    U32 openStreams = 16;
+    U32 requestsPerSecond = 64;
+    // Bytes of the data of one POST request; a longer one is refused.
+    U32 postBytes = 1u << 20;
 };
 
 // The table in force.

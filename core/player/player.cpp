@@ -20,6 +20,7 @@ SPlayer::SPlayer()
     display = &scene;
     RectSetEmpty(&zoomRect);
     RectSetEmpty(&screenDirty);
+    scene.splayer = this;
     scene.AddThread(this);
     scene.SetBits(&bits);
     scene.soundMix = theSoundMix;
@@ -37,6 +38,7 @@ SPlayer::~SPlayer()
         movie->stream = nullptr;
     FreeLayers();
     scene.SetBits(nullptr);
+    scene.splayer = nullptr;
     splayer = nullptr;
 }
 

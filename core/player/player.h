@@ -3,10 +3,16 @@
 #pragma once
 
 #include "core/display/display_list.h"
+#include "core/player/drag.h"
+#include "core/player/focus.h"
 #include "core/player/menu_status.h"
+#include "core/player/save_focus.h"
+#include "core/player/trace.h"
+#include "core/player/values.h"
 #include "core/raster/bit_buffer.h"
 #include "core/stream/script_player.h"
 
+struct LoadInfo;
 struct StreamData;
 
 // The platform's microsecond clock: any origin, never goes backwards. Supplied by the shell.
@@ -49,6 +55,9 @@ public:
     ScriptPlayer fontPlayer; // the movie of the built-in fonts, in no list of levels
     FontState fontState = kFontsUntried;
     int actionDepth = 0;             // above 0 while actions run
+    bool actionsAborted = false;     // a script ran away: no action runs until the movie goes
+    ValueStack stack;                // of the scripts; what is on it stays from run to run
+    ScriptTracer tracer;             // told of every record before it is executed
     S32 nextFrameTime = 0;           // clock value at which the next frame is due
     int loaded = 0;                  // the first frame can be shown
     int running = 0;                 // the shell's timer runs
@@ -57,6 +66,17 @@ public:
     SPOINT mousePt = {};             // where it was, in pixels
     S32 startTime = 0;               // clock value at construction
     int firstLoad = 0;               // the next stream that opens is the movie of ControlOpen
+    char* baseURL = nullptr;         // owned; what relative URLs are resolved against
+    ScriptPlayer* loaders = nullptr; // of variables that are still arriving, through nextLayer
+    ObjectRef focusText{&scene};     // the text field that has the keyboard focus
+    SButton buttonFocus{&scene};     // the button that has it
+    SButton savedFocus{&scene};      // what had it last: Tab restores it
+    SaveFocus focus{this};           // keeps both over a rebuild
+    ButtonOrder buttonOrder{&scene}; // the nearest buttons, by direction
+    GrowBuffer<ButtonWeight> tabMap; // all focusable buttons, while they are looked at
+    int panning = 0;                 // a press on a zoomed view drags it
+    SPOINT panStart = {};            // where the pointer was at the last step, in pixels
+    SDrag drag{&scene};              // the object that scripts let the pointer drag
     SRECT screenDirty;               // pixels that are to be copied to the screen
     MenuStatus menuMask = kAllMenus; // what the host allows; see SetMenuState
 
@@ -89,13 +109,20 @@ public:
     virtual void ClientRect(SRECT* r) = 0;
     // Offers a window size in pixels for a movie that has just been opened.
     virtual void AdjustWindow(S32 width, S32 height) = 0;
-    // Starts a POST or a GET request; its data arrives later, never inside the call.
+    // Starts a POST or a GET request, by an absolute URL if there is a base; its data arrives
+    // later, through StreamInNew, StreamInWrite and StreamInDestroy, never inside the call.
+    // `target` names a browser window, and then there is no `notifyData`; without it the data comes
+    // back here with `notifyData` (null for the movie of ControlOpen). A request that is refused or
+    // fails before its stream opens ends with StreamFailed, later as well. The strings do not
+    // outlive the call; `length` counts the zero byte at the end of `data`, which begins with two
+    // header lines and a blank one.
     virtual void StreamPostURLNotify(const char* url, const char* target, U32 length,
                                      const char* data, void* notifyData) = 0;
     virtual void StreamGetURLNotify(const char* url, const char* target, void* notifyData) = 0;
-    // Aborts a stream; nothing of it arrives afterwards.
+    // Aborts a stream; nothing of it arrives afterwards. It may be the very stream whose data is
+    // being delivered.
     virtual void CloseStream(StreamData* stream) = 0;
-    // Passes a command to whatever contains the player.
+    // Passes a command to whatever contains the player. Neither string outlives the call.
     virtual void ProcessFSCommand(const char* command, const char* args) = 0;
     // Brings menus up to date; after each control.
     virtual void EnableMenus(const MenuStatus& status) = 0;
@@ -119,8 +146,101 @@ public:
     void Suspend();
     // For the loader, when the first frame is there: the ticks start unless it is suspended.
     void StartTicks();
-    // Runs the queued actions.
+    // Runs the queued actions, then sends off the requests that they made. Nothing inside itself.
     void DoActions();
+
+    // --- values of scripts; strings returned are the caller's, freed with FreeStr ---
+    void Push(const char* text);
+    void PushNum(double value);
+    // The empty string from an empty stack; null only when memory is exhausted.
+    char* Pop();
+    double PopNum();
+
+    // --- names in scripts ---
+    // The timeline at a path of names separated by "/", from an object or, with null or a leading
+    // "/", from a root; null when there is none.
+    ScriptThread* FindTarget(SObject* from, const char* path);
+    // The path of an object as scripts write it; null when memory is exhausted.
+    char* GetTargetPath(SObject* obj);
+    // Splits "target:name": the timeline before the colon, null when there is none of that path;
+    // without a colon `thread`, or the player for null. *rest is what follows.
+    ScriptThread* ResolveVariable(const char* path, ScriptThread* thread, const char** rest);
+    // "target:frame" with a number from 1 or a label: the timeline and its frame from 0; null when
+    // either is not there.
+    ScriptThread* ResolveFrameNum(const char* spec, ScriptThread* thread, S32* frame);
+    // The value of a variable by its path, or of a text field's scroll position; null when absent.
+    char* GetVariable(ScriptThread* thread, const char* path);
+    // The same as a value for the stack; false, and empty, when absent.
+    bool GetVariable(ScriptThread* thread, const char* path, ScriptValue* value);
+    using ScriptThread::SetVariable;
+    void SetVariable(ScriptThread* thread, const char* path, const char* value, int updateFields);
+    // Properties by index (0 x position to 18 sound buffer time); 0 and "" for those that are not.
+    double GetProperty(ScriptThread* thread, int index);
+    void SetProperty(ScriptThread* thread, int index, double value);
+    char* GetPropertyStr(ScriptThread* thread, int index);
+    void SetPropertyStr(ScriptThread* thread, int index, const char* value);
+    // Runs the actions of a frame of the timeline at once.
+    void CallFrame(ScriptThread* thread, S32 frame);
+    // Has the pointer drag the object of a timeline. `bounds` (twips, of its parent) keeps it
+    // inside, unless empty.
+    void StartDrag(ScriptThread* thread, bool lockCenter, const SRECT* bounds);
+    // Notes in the dragged object where it was dropped, and lets it go.
+    void EndDrag();
+    void UpdateDragObject(const SPOINT* pt);
+    void UpdateDropTarget();
+
+    // --- mouse and keyboard; pixels; ignored until the first frame is there ---
+    // A shell announces a press at a new position by a MouseMove there, else a button under it
+    // does not notice.
+    void MouseDown(S32 x, S32 y);
+    void MouseMove(S32 x, S32 y, int buttonDown);
+    void MouseUp(S32 x, S32 y);
+    // The mouse is lost to others; with `release` as if it were let go outside.
+    void CancelCapture(int release);
+    // Key codes: 1 left, 2 right, 13 Enter, 14 up, 15 down, 18 Tab, 32 Space; 3 Home, 4 End, 6 page
+    // up, 7 page down, 8 Backspace, 27 Escape, 127 Delete; 33 to 126 and 160 to 255 characters.
+    // Modifiers: 0x01 Shift, 0x02 Ctrl or Command, 0x04 Alt. 1 when the key was consumed.
+    int HandleKeyDown(int key, int modifiers);
+    int HandleKeyUp(int key, int modifiers);
+    // 0 arrow, 1 open hand (zoomed), 2 hand (button), 3 I-beam.
+    int GetCursorType() const;
+    void DoButton(const SPOINT* pt, int mouseDown, int updateScreen);
+    void DoButton(SObject* obj, int mouseDown, int updateScreen);
+    // Shows or hides the keyboard focus on a button.
+    void ButtonFocusSet(SObject* obj);
+    void ButtonFocusRemove();
+    int TabKeyDown(int key, int modifiers);
+    void ButtonTabNext();
+    void ButtonTabPrevious();
+    void ButtonGoDirection(int direction);
+    void ButtonEnter();
+    // The entry of the tab map for an object; false when it is no focusable button.
+    bool ButtonFind(SObject* obj, SRECT* bounds);
+    void BuildButtonTabMap();
+    int NumButtons() const;
+    void AddButton(SObject* obj, const SRECT* bounds);
+    void RemoveAllButtons();
+    // An object is about to be removed: lets go of it wherever that is seen.
+    void BeforeRemoval(SObject* obj);
+
+    // --- URLs ---
+    // Routes one request: a host command, a browser window, a level or a sprite. Flags: 0x40 the
+    // window is a target path, 0x80 variables instead of a movie.
+    void GetURL(const char* url, const char* window, const char* postData, int flags);
+    void LoadLayer(const char* url, S32 layer, const char* postData, const char* target, int flags);
+    // `info` goes to the platform.
+    void NetscapeDoURL(const char* url, const char* window, const char* postData, LoadInfo* info);
+    // `url` against a base: a new string, freed with FreeStr, or `url` itself when nothing is to be
+    // done; null on failure.
+    char* BuildRelative(const char* base, char* url);
+    // A movie in the place of a sprite; null when there can be none.
+    ScriptPlayer* OpenSprite(ScriptThread* sprite);
+    // The platform's answers, from its event loop. Bytes consumed; -1 when nobody wants them.
+    void StreamInNew(StreamData* stream, const char* url, void* notifyData);
+    S32 StreamInWrite(StreamData* stream, const void* data, S32 length);
+    void StreamInDestroy(StreamData* stream);
+    // Nothing will come for this request.
+    void StreamFailed(void* notifyData);
 
     // --- levels ---
     // The movie of a level, made when absent; cleared first unless `keep`. Null when it cannot be
@@ -234,6 +354,10 @@ private:
     void TopLeftView(SRECT* r);
     bool ShowsAt100();
     void RequestMovie(const char* url);
+    bool QueueKeyConditions(int key);
+    void PanTo(S32 x, S32 y);
+    bool QueueFrameActions(ScriptThread* thread, S32 frame, ActionList* list);
+    bool MouseIsHeld() const;
     void OfferWindow();
     void RefreshMenus();
     void RunFontMovie(const U8* data, S32 size);

@@ -18,7 +18,12 @@ constexpr int kWorkPerHeader = 4;
 std::atomic<U64> lastSoundTag{0};
 } // namespace
 
-ScriptThread::ScriptThread() : soundTag(++lastSoundTag)
+U64 NewSoundTag()
+{
+    return ++lastSoundTag;
+}
+
+ScriptThread::ScriptThread() : soundTag(NewSoundTag())
 {
     ClearState();
 }

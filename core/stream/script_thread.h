@@ -27,6 +27,9 @@ struct SVariable {
 // Results of the operations that run tags; negative values are the loader's error.
 enum SDrawResult : S32 { kDrawn = 0, kNeedsData = 1, kAtEnd = 2, kDrawFailed = -2 };
 
+// Marks the sounds of one owner; never the same twice.
+U64 NewSoundTag();
+
 // Executes a timeline's tags frame by frame: places, moves and removes display objects through the
 // display list and keeps the timeline's variables. Frames count from 0; a frame is the run of tags
 // up to and including its ShowFrame. A sprite's thread is created with its display object and

@@ -1,0 +1,98 @@
+#include <cstdlib>
+#include <cstring>
+#include <new>
+
+#include "core/player/limits.h"
+#include "core/player/values.h"
+#include "core/stream/str.h"
+
+namespace {
+constexpr U32 kFirstValues = 128;
+}
+
+ScriptValue::ScriptValue(ScriptValue&& other)
+{
+    TakeFrom(other);
+}
+
+ScriptValue& ScriptValue::operator=(ScriptValue&& other)
+{
+    if (this != &other) {
+        Clear();
+        TakeFrom(other);
+    }
+    return *this;
+}
+
+void ScriptValue::TakeFrom(ScriptValue& other)
+{
+    kind = other.kind;
+    length = other.length;
+    if (kind == kInlineText)
+        std::memcpy(small, other.small, length + 1);
+    else if (kind == kHeapText)
+        large = other.large;
+    else
+        number = other.number;
+    other.kind = kInlineText;
+    other.length = 0;
+    other.small[0] = 0;
+}
+
+void ScriptValue::Clear()
+{
+    if (kind == kHeapText)
+        FreeStr(large);
+    kind = kInlineText;
+    length = 0;
+    small[0] = 0;
+}
+
+ValueStack::~ValueStack()
+{
+    Clear();
+    std::free(values);
+}
+
+// The empty string is all zeros, and a value is moved by its bytes.
+bool ValueStack::Grow()
+{
+    const U32 doubled = capacity ? capacity * 2 : kFirstValues;
+    if (count >= gLimits.stackValues)
+        return false;
+    void* grown = std::realloc(static_cast<void*>(values), doubled * sizeof(ScriptValue));
+    if (!grown)
+        return false;
+    values = static_cast<ScriptValue*>(grown);
+    capacity = doubled;
+    return true;
+}
+
+ScriptValue* ValueStack::Push()
+{
+    if (count >= capacity && !Grow()) {
+        overflowed = true;
+        return nullptr;
+    }
+    return new (&values[count++]) ScriptValue;
+}
+
+ScriptValue ValueStack::Pop()
+{
+    ScriptValue top;
+    if (count > 0)
+        top = static_cast<ScriptValue&&>(values[--count]);
+    return top;
+}
+
+ScriptValue* ValueStack::Peek(U32 i)
+{
+    return i < count ? &values[count - 1 - i] : nullptr;
+}
+
+void ValueStack::Clear()
+{
+    while (count > 0)
+        values[--count].Clear();
+    overflowed = false;
+}
