@@ -56,6 +56,7 @@ public:
     FontState fontState = kFontsUntried;
     int actionDepth = 0;             // above 0 while actions run
     bool actionsAborted = false;     // a script ran away: no action runs until the movie goes
+    U64 scriptWork = 0;              // of this run, see SLimits::workPerRun: what walks adds to it
     ValueStack stack;                // of the scripts; what is on it stays from run to run
     ScriptTracer tracer;             // told of every record before it is executed
     S32 nextFrameTime = 0;           // clock value at which the next frame is due
@@ -68,6 +69,8 @@ public:
     int firstLoad = 0;               // the next stream that opens is the movie of ControlOpen
     char* baseURL = nullptr;         // owned; what relative URLs are resolved against
     ScriptPlayer* loaders = nullptr; // of variables that are still arriving, through nextLayer
+    U32 session = 0;                 // counts ControlOpen and ControlClose: requests made before
+                                     // the last of them are nobody's
     ObjectRef focusText{&scene};     // the text field that has the keyboard focus
     SButton buttonFocus{&scene};     // the button that has it
     SButton savedFocus{&scene};      // what had it last: Tab restores it
@@ -112,9 +115,8 @@ public:
     // Starts a POST or a GET request, by an absolute URL if there is a base; its data arrives
     // later, through StreamInNew, StreamInWrite and StreamInDestroy, never inside the call.
     // `target` names a browser window, and then there is no `notifyData`; without it the data comes
-    // back here with `notifyData` (null for the movie of ControlOpen). A request that is refused or
-    // fails before its stream opens ends with StreamFailed, later as well. The strings do not
-    // outlive the call; `length` counts the zero byte at the end of `data`, which begins with two
+    // back here with `notifyData`. A request that is refused or fails before its stream opens ends
+    // with StreamFailed, later as well. The strings do not outlive the call; `length` counts the zero byte at the end of `data`, which begins with two
     // header lines and a blank one.
     virtual void StreamPostURLNotify(const char* url, const char* target, U32 length,
                                      const char* data, void* notifyData) = 0;
@@ -241,6 +243,9 @@ public:
     void StreamInDestroy(StreamData* stream);
     // Nothing will come for this request.
     void StreamFailed(void* notifyData);
+    // For a loader of variables whose stream has ended: hands them to their timeline, if it is
+    // still there, and destroys the loader.
+    void DeliverVariables(ScriptPlayer* loader);
 
     // --- levels ---
     // The movie of a level, made when absent; cleared first unless `keep`. Null when it cannot be
@@ -353,10 +358,25 @@ private:
     void LeaveFixedScale();
     void TopLeftView(SRECT* r);
     bool ShowsAt100();
-    void RequestMovie(const char* url);
-    bool QueueKeyConditions(int key);
-    void PanTo(S32 x, S32 y);
-    bool QueueFrameActions(ScriptThread* thread, S32 frame, ActionList* list);
+    char* ResolveURL(const char* url);
+    void UnloadTarget(ScriptThread* target);
+    bool IsLevel(const ScriptThread* thread) const;
+    U32 CountMovies() const;
+    LoadInfo* NewLoadInfo(S32 layer, const char* target, bool loadVars);
+    void ForgetRequests();
+    ScriptPlayer* OpenReceiver(LoadInfo* info);
+    ScriptPlayer* NewLoader(LoadInfo* info);
+    ScriptPlayer* NewMovie();
+    void FreeLoader(ScriptPlayer* loader);
+    void LinkStream(StreamData* stream, ScriptPlayer* receiver);
+    bool BeginInput();
+    void FinishButton(int updateScreen);
+    void NotePointer(const SPOINT* pt, int mouseDown);
+    void PanTo(const SPOINT* pt);
+    void ShowFocus(const SRECT* r);
+    void HideFocus();
+    void FollowFocus();
+    void ForgetInput();
     bool MouseIsHeld() const;
     void OfferWindow();
     void RefreshMenus();

@@ -30,11 +30,13 @@ private:
         U8 type; // of the character
     };
 
+    void RestoreButton(SObject* obj);
     void Remember(const SObject* obj, SPath* path) const;
     SObject* Follow(const SPath& path) const;
 
     SPlayer* splayer;
     int nesting = 0;
+    bool shown = false; // the button's focus, by its highlight
     SPath button;
     SPath text;
 };
