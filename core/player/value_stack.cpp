@@ -24,16 +24,12 @@ ScriptValue& ScriptValue::operator=(ScriptValue&& other)
     return *this;
 }
 
+// All bytes, whichever of its forms the value has.
 void ScriptValue::TakeFrom(ScriptValue& other)
 {
     kind = other.kind;
     length = other.length;
-    if (kind == kInlineText)
-        std::memcpy(small, other.small, length + 1);
-    else if (kind == kHeapText)
-        large = other.large;
-    else
-        number = other.number;
+    std::memcpy(small, other.small, sizeof small);
     other.kind = kInlineText;
     other.length = 0;
     other.small[0] = 0;
@@ -58,8 +54,6 @@ ValueStack::~ValueStack()
 bool ValueStack::Grow()
 {
     const U32 doubled = capacity ? capacity * 2 : kFirstValues;
-    if (count >= gLimits.stackValues)
-        return false;
     void* grown = std::realloc(static_cast<void*>(values), doubled * sizeof(ScriptValue));
     if (!grown)
         return false;
@@ -70,7 +64,7 @@ bool ValueStack::Grow()
 
 ScriptValue* ValueStack::Push()
 {
-    if (count >= capacity && !Grow()) {
+    if (count >= gLimits.stackValues || (count >= capacity && !Grow())) {
         overflowed = true;
         return nullptr;
     }

@@ -16,7 +16,7 @@ public:
     ScriptValue& operator=(ScriptValue&& other);
 
     void Clear();
-    // Cut at the limit on one string; empty when no memory or budget is left.
+    // Cut at the limit on one string, and at a zero byte; empty when no memory or budget is left.
     void SetText(const char* text, int n);
     // As if formatted: rounded to 15 digits.
     void SetNumber(double value);
@@ -36,6 +36,7 @@ private:
     enum Kind : U8 { kInlineText, kHeapText, kNumber };
 
     void TakeFrom(ScriptValue& other);
+    void SetLarge(char* text);
 
     Kind kind = kInlineText;
     U32 length = 0;

@@ -34,7 +34,8 @@ U8 Fold(char c)
     return byte >= 'a' && byte <= 'z' ? static_cast<U8>(byte - ('a' - 'A')) : byte;
 }
 
-char* NewStr(const char* s, size_t n)
+// Room for n bytes, the terminating zero behind them set.
+char* NewStr(size_t n)
 {
     const size_t bytes = n + 1 + kHeapBytes;
     if (!ReserveStrBytes(bytes))
@@ -47,7 +48,6 @@ char* NewStr(const char* s, size_t n)
     }
     head->bytes = bytes;
     char* copy = reinterpret_cast<char*>(head + 1);
-    std::memcpy(copy, s, n);
     copy[n] = 0;
     return copy;
 }
@@ -67,7 +67,19 @@ char* CreateStr(const char* s)
 
 char* CreateStr(const char* s, int n)
 {
-    return s ? NewStr(s, n > 0 ? static_cast<size_t>(n) : 0) : nullptr;
+    return s ? JoinStr(s, n, s, 0) : nullptr;
+}
+
+char* JoinStr(const char* s, int n, const char* t, int m)
+{
+    const size_t first = n > 0 ? static_cast<size_t>(n) : 0;
+    const size_t second = m > 0 ? static_cast<size_t>(m) : 0;
+    char* copy = NewStr(first + second);
+    if (!copy)
+        return nullptr;
+    std::memcpy(copy, s, first);
+    std::memcpy(copy + first, t, second);
+    return copy;
 }
 
 void FreeStr(char* s)

@@ -14,6 +14,8 @@ int StrLength(const char* s);
 char* CreateStr(const char* s);
 // A copy of exactly n bytes with a terminating zero added.
 char* CreateStr(const char* s, int n);
+// The same of n bytes of s followed by m bytes of t.
+char* JoinStr(const char* s, int n, const char* t, int m);
 // Only for what CreateStr made; null-safe.
 void FreeStr(char* s);
 
