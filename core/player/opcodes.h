@@ -11,7 +11,7 @@ enum SOpcode : U8 {
     kOpStop = 0x07,
     kOpToggleQuality = 0x08,
     kOpStopSounds = 0x09,
-    kOpAdd = 0x0A, // pop a, b (a was pushed last); push a + b, and so on
+    kOpAdd = 0x0A, // pop a, b (b was pushed last); push a + b, and so on
     kOpSubtract = 0x0B,
     kOpMultiply = 0x0C,
     kOpDivide = 0x0D,

@@ -47,9 +47,6 @@ void SPlayer::AdvanceThreads(const ScriptThread* pace)
     }
 }
 
-// The place where the queue of actions will be run; movies have none yet.
-void SPlayer::DoActions() {}
-
 // The place where buttons that move under a pointer at rest will change their state: tested at
 // mousePt, once mouseState is known, unless a press or a drag holds the mouse. Movies have no
 // buttons yet.
