@@ -1,13 +1,17 @@
 // The controls that a menu or a page drives. Each ends with a look at the menus.
 #include "core/player/player.h"
+#include "core/stream/str.h"
 
 void SPlayer::ControlOpen(const char* url)
 {
     if (url != nullptr && *url != 0) {
         scene.Reset();
         ClearScript();
+        ForgetRequests();
+        FreeStr(baseURL);
+        baseURL = nullptr;
         firstLoad = 1;
-        RequestMovie(url);
+        GetURL(url, "_level0", nullptr, 0);
         if (gotHeader)
             OfferWindow();
     }
@@ -17,14 +21,8 @@ void SPlayer::ControlOpen(const char* url)
 void SPlayer::ControlClose()
 {
     ClearScript();
+    ForgetRequests();
     RefreshMenus();
-}
-
-// The one request that there is so far: the place where all will be routed to levels, sprites and
-// windows. The first load needs no note of where its data belongs.
-void SPlayer::RequestMovie(const char* url)
-{
-    StreamGetURLNotify(url, nullptr, nullptr);
 }
 
 // Twips to whole pixels, toward zero.

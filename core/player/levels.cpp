@@ -7,14 +7,6 @@
 
 namespace {
 
-U32 CountLayers(const ScriptPlayer* first)
-{
-    U32 n = 0;
-    for (; first != nullptr; first = first->nextLayer)
-        n++;
-    return n;
-}
-
 } // namespace
 
 ScriptPlayer* FindLayer(ScriptPlayer* first, S32 layer)
@@ -53,12 +45,9 @@ ScriptPlayer* SPlayer::OpenLayer(S32 layer, int keep)
 
 ScriptPlayer* SPlayer::NewLayer(S32 layer)
 {
-    if (layer < 0 || layer > kLastLayer || CountLayers(layers) >= gLimits.loadedMovies)
-        return nullptr;
-    ScriptPlayer* movie = new (std::nothrow) ScriptPlayer;
+    ScriptPlayer* movie = layer < 0 || layer > kLastLayer ? nullptr : NewMovie();
     if (movie == nullptr)
         return nullptr;
-    movie->splayer = this;
     movie->display = &scene;
     movie->layerNum = layer;
     movie->layerDepth = static_cast<U16>(layer);
@@ -66,6 +55,34 @@ ScriptPlayer* SPlayer::NewLayer(S32 layer)
     layers = movie;
     scene.AddThread(movie);
     return movie;
+}
+
+// Every movie beside the root: in levels, in sprites, and variables that are arriving.
+U32 SPlayer::CountMovies() const
+{
+    U32 n = 0;
+    for (const ScriptThread* thread = scene.threads; thread != nullptr; thread = thread->nextThread)
+        n += thread->IsRoot() && thread != this && thread != &fontPlayer;
+    for (const ScriptPlayer* loader = loaders; loader != nullptr; loader = loader->nextLayer)
+        n++;
+    return n;
+}
+
+// Of no list yet; null when there are too many or memory is exhausted.
+ScriptPlayer* SPlayer::NewMovie()
+{
+    if (CountMovies() >= gLimits.loadedMovies)
+        return nullptr;
+    ScriptPlayer* movie = new (std::nothrow) ScriptPlayer;
+    if (movie != nullptr)
+        movie->splayer = this;
+    return movie;
+}
+
+// The timeline is the root of a level, and not of a movie in a sprite.
+bool SPlayer::IsLevel(const ScriptThread* thread) const
+{
+    return thread == this || (thread->IsRoot() && FindLayer(layers, thread->layerNum) == thread);
 }
 
 void SPlayer::ClearLayer(S32 layer)

@@ -1,6 +1,9 @@
 #include "core/player/player.h"
+#include "core/stream/str.h"
 
 #include <cstdio>
+
+#include "core/player/action_runner.h"
 
 namespace {
 
@@ -37,6 +40,10 @@ SPlayer::~SPlayer()
     for (ScriptPlayer* movie = layers; movie != nullptr; movie = movie->nextLayer)
         movie->stream = nullptr;
     FreeLayers();
+    for (ScriptPlayer* loader = loaders; loader != nullptr; loader = loader->nextLayer)
+        loader->stream = nullptr;
+    ForgetRequests();
+    FreeStr(baseURL);
     scene.SetBits(nullptr);
     scene.splayer = nullptr;
     splayer = nullptr;
@@ -80,6 +87,10 @@ void SPlayer::ClearScript()
 {
     StopTicks();
     FreeLayers();
+    EndCalls(&scene.calls);
+    scene.actions.Clear();
+    actionsAborted = false;
+    ForgetInput();
     RectSetEmpty(&zoomRect);
     loaded = 0;
     slowTicks = fastTicks = sampledTicks = 0;

@@ -162,6 +162,8 @@ public:
     // The timeline at a path of names separated by "/", from an object or, with null or a leading
     // "/", from a root; null when there is none.
     ScriptThread* FindTarget(SObject* from, const char* path);
+    // The same for the first `length` characters of a path.
+    ScriptThread* FindTarget(SObject* from, const char* path, int length);
     // The path of an object as scripts write it; null when memory is exhausted.
     char* GetTargetPath(SObject* obj);
     // Splits "target:name": the timeline before the colon, null when there is none of that path;
@@ -360,6 +362,7 @@ private:
     bool ShowsAt100();
     char* ResolveURL(const char* url);
     void UnloadTarget(ScriptThread* target);
+    bool PrepareLoad(const char* url, S32 layer, const char* target, int flags);
     bool IsLevel(const ScriptThread* thread) const;
     U32 CountMovies() const;
     LoadInfo* NewLoadInfo(S32 layer, const char* target, bool loadVars);
@@ -372,6 +375,10 @@ private:
     bool BeginInput();
     void FinishButton(int updateScreen);
     void NotePointer(const SPOINT* pt, int mouseDown);
+    const char* FindValue(ScriptThread* thread, const char* path);
+    double ObjectProperty(SObject* obj, int index);
+    void SetObjectProperty(SObject* obj, int index, double value);
+    SPOINT DragPoint(const SPOINT* pt) const;
     void PanTo(const SPOINT* pt);
     void ShowFocus(const SRECT* r);
     void HideFocus();

@@ -13,6 +13,7 @@ struct LoadInfo {
     S32 layer;    // level that receives the data; -1 with a target
     char* target; // owned; path of the sprite that receives it; null: the level does
     S32 loadVars; // the stream carries variables, not a movie
+    U32 session;  // of the player when it was made: see SPlayer::session
 };
 
 // Notify data of a stream that is not for the player.

@@ -149,6 +149,8 @@ void ScriptThread::CloneSprite(ScriptThread* src, const char* name, S32 depth)
     const SObject* source = src ? src->rootObject : nullptr;
     if (!source || !source->character || !rootObject || !display || !player)
         return;
+    if (depth < 0 || depth > 0xFFFF)
+        return;
     PlaceInfo info;
     CopyPlacement(source, &info);
     info.depth = static_cast<U16>(depth);
@@ -182,21 +184,26 @@ void ScriptThread::RemoveSprite(ScriptThread* sprite, bool keep)
         display->RemoveThisObject(old);
         return;
     }
-    // Removing the old object ends its timeline, which may be this one: only locals are used after.
-    DisplayList* list = display;
+    const ScriptThread* around = old->parent->thread;
+    ReplaceObject(old, NewEmptySprite(around ? around->player : player, old->character));
+}
+
+// Removing the old object ends its timeline, and with it perhaps the caller's.
+SObject* ScriptThread::ReplaceObject(SObject* old, SCharacter* fresh)
+{
+    DisplayList* list = old->display;
     SObject* parent = old->parent;
     PlaceInfo info;
     CopyPlacement(old, &info);
-    info.character =
-        NewEmptySprite(parent->thread ? parent->thread->player : player, old->character);
+    info.puppet = old->puppet;
     char* nameCopy = CreateStr(old->name);
     SetName(&info, nameCopy);
-    RetainCharacter(info.character);
-    list->pending = info.character;
+    RetainCharacter(fresh);
+    list->pending = fresh;
     list->RemoveThisObject(old);
     info.character = TakePending(list);
-    if (info.character)
-        list->PlaceObject(parent, &info);
+    SObject* placed = info.character ? list->PlaceObject(parent, &info) : nullptr;
     ReleaseCharacter(info.character);
     FreeStr(nameCopy);
+    return placed;
 }

@@ -7,6 +7,7 @@
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
 #include "core/player/player.h"
+#include "core/player/stream_data.h"
 #include "core/stream/movie_data.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
@@ -143,6 +144,16 @@ void ScriptPlayer::PushVariables(const U8* data, S32 n)
         std::memcpy(varsData.data() + held, data, count);
 }
 
+// The zero byte at its end is not part of it.
+const char* ScriptPlayer::VariablesText()
+{
+    const size_t held = varsData.size();
+    if (!varsData.Push(0))
+        return nullptr;
+    varsData.Truncate(held);
+    return reinterpret_cast<const char*>(varsData.data());
+}
+
 void ScriptPlayer::PushDataComplete()
 {
     if (splayer != this || splayer->loaded)
@@ -162,15 +173,17 @@ void ScriptPlayer::PushDataComplete()
 // What is missing stays missing; a streaming sound that waits for it must know.
 void ScriptPlayer::SetDataComplete()
 {
+    if (varsMode && splayer) {
+        splayer->DeliverVariables(this);
+        return;
+    }
     if (sharedScript)
         sharedScript->Close();
 }
 
 void ScriptPlayer::ClearScript()
 {
-    if (stream && splayer)
-        splayer->CloseStream(stream);
-    stream = nullptr;
+    LeaveStream();
     Silence();
     FreeAll();
     ReleaseBuffer();
@@ -182,6 +195,17 @@ void ScriptPlayer::ClearScript()
     numFramesComplete = -1;
     scanPos = 0;
     startPos = 0;
+}
+
+// The stream may be the one whose data is being delivered: it feeds nobody from here on.
+void ScriptPlayer::LeaveStream()
+{
+    StreamData* feeding = stream;
+    stream = nullptr;
+    if (!feeding || !splayer)
+        return;
+    feeding->player = nullptr;
+    splayer->CloseStream(feeding);
 }
 
 // Lets go of the bytes; the last of their holders frees them.

@@ -56,8 +56,11 @@ public:
     void PushDataBuf(const U8* data, S32 n);
     // For the player's own movie, after each block: shows the first frame once it is there.
     void PushDataComplete();
-    // The stream has ended.
+    // The stream has ended. A loader of variables delivers them and is gone.
     void SetDataComplete();
+    // The text that a loader of variables has so far, valid until more arrives; null when memory is
+    // exhausted.
+    const char* VariablesText();
 
     // Drops the movie and all that came of it; ready for another. A movie shown in a sprite's place
     // belongs to its object, which goes: the caller has the movie from then on.
@@ -113,6 +116,7 @@ private:
     void CountCompleteFrames();
     void ReleaseBuffer();
     void PushVariables(const U8* data, S32 n);
+    void LeaveStream();
     bool IndexCharacter(U16 id, SCharacter* ch);
     void FreeIdPages();
     void StopPlaying(const SCharacter* ch);

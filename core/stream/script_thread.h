@@ -55,6 +55,7 @@ public:
     const char* label = nullptr;    // last FrameLabel seen, in the movie buffer
     DisplayList* display = nullptr; // where the timeline's objects are
     SObject* rootObject = nullptr;  // parent of everything that this timeline places
+    bool actionsQueued = false;     // blocks of actions may wait for it; see ActionList
     bool streamStart = true;        // a block may start the streaming sound
     U8 streamFormat = 11;           // first byte of the stream head; kept, not used
     CSound streamSound;             // what the stream head says
@@ -95,6 +96,9 @@ public:
     void CloneSprite(ScriptThread* src, const char* name, S32 depth);
     // Removes the sprite's object; with `keep` an empty sprite takes its place, transform and name.
     void RemoveSprite(ScriptThread* sprite, bool keep);
+    // Removes an object that has a parent and shows `fresh` there, with its transform, name, mask
+    // and puppet flag. The new object, null when it cannot be placed or `fresh` is null.
+    static SObject* ReplaceObject(SObject* old, SCharacter* fresh);
 
     // Makes sure that the pixels of a bitmap exist, decoding its tag in the movie that owns it;
     // false when there are none: no bitmap, no image in the tag, no room for it. That is remembered
@@ -140,6 +144,7 @@ private:
     void Dispatch();
     void DispatchDefinition();
     bool MakeRootObject();
+    S32 RunTo(S32 frame, bool seek);
     S32 SeekBack(S32 frame);
     void RunSilently(S32 frame);
     void StopSound();
@@ -152,6 +157,7 @@ private:
     void PlaceObject2();
     void PlaceOrMove(const PlaceInfo& info);
     void RemoveObject();
+    void DoAction();
     void SetBackgroundColor();
     void DefineShape();
     void DefineMorphShape();

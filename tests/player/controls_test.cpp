@@ -10,8 +10,9 @@ namespace {
 struct ToldShell : PlayingShell {
     using PlayingShell::PlayingShell;
     void EnableMenus(const MenuStatus& status) override { menu = status; }
-    void StreamGetURLNotify(const char*, const char*, void*) override
+    void StreamGetURLNotify(const char*, const char*, void* notifyData) override
     {
+        StreamFailed(notifyData);
         PushDataBuf(answer.data(), S32(answer.size()));
     }
     void GetUnixFontData(U8** data, S32* size) override
