@@ -1,5 +1,6 @@
 #include "core/sound/mp3_frames.h"
 
+#include <algorithm>
 #include <cstring>
 
 static constexpr S32 kHeaderSize = 4;
@@ -32,11 +33,17 @@ static bool SameKind(const U8* a, const U8* b)
     return ((a[0] ^ b[0]) & kKindBits[0]) == 0 && ((a[1] ^ b[1]) & kKindBits[1]) == 0;
 }
 
-void CMp3Frames::Reset()
+static bool IsFull(const U8* header)
+{
+    return (header[1] & 0x18) == 0x18;
+}
+
+void CMp3Frames::Reset(bool full)
 {
     begin = 0;
     end = 0;
-    junk = 0;
+    junkLeft = kMostJunk;
+    expectFull = full;
     fresh = true;
     inStep = false;
     kind[0] = 0;
@@ -58,7 +65,7 @@ S32 CMp3Frames::Add(const U8* data, S32 size)
 
 bool CMp3Frames::Fits(const U8* header) const
 {
-    return kind[0] == 0 || SameKind(header + 1, kind);
+    return IsFull(header) == expectFull && (kind[0] == 0 || SameKind(header + 1, kind));
 }
 
 // Whether what looks like a frame is one, as far as what follows it tells. Sets `*wait` when that
@@ -75,14 +82,14 @@ bool CMp3Frames::Trusted(const U8* header, S32 length, bool* wait) const
 
 const U8* CMp3Frames::Next(S32* size)
 {
-    for (; end - begin >= kHeaderSize; ++begin, ++junk) {
+    for (; end - begin >= kHeaderSize && !Spent(); ++begin, --junkLeft) {
         const U8* header = input + begin;
         const S32 length = FrameSize(header);
         bool wait = false;
         if (length > 0 && Fits(header) && Trusted(header, length, &wait)) {
             std::memcpy(kind, header + 1, sizeof kind);
             begin += length;
-            junk = 0;
+            junkLeft = std::min(junkLeft + length * kJunkPerByte, kMostJunk);
             fresh = false;
             inStep = true;
             *size = length;

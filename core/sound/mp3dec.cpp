@@ -6,8 +6,6 @@
 
 #include "core/sound/mp3_frames.h"
 
-static constexpr S32 kJunkLimit = 128 * 1024; // bytes searched for a frame before giving up
-
 struct SMp3Decoder {
     mpg123_handle* handle = nullptr;
     S32 warmChannels = 0;  // what the library's memory fits: channels of the output,
@@ -44,11 +42,11 @@ SMp3Decoder* mp3decOpen()
     return nullptr;
 }
 
-static bool Begin(SMp3Decoder* decoder, S32 channels)
+static bool Begin(SMp3Decoder* decoder, S32 channels, bool full)
 {
     mpg123_handle* handle = decoder->handle;
     mpg123_close(handle);
-    decoder->frames.Reset();
+    decoder->frames.Reset(full);
     decoder->ended = false;
     const int form = channels == 2 ? MPG123_STEREO : MPG123_MONO;
     return mpg123_format_none(handle) == MPG123_OK &&
@@ -75,11 +73,11 @@ static bool WarmUp(SMp3Decoder* decoder, S32 channels, bool full)
 bool mp3decReset(SMp3Decoder* decoder, S32 channels, S32 rate)
 {
     const bool full = rate > 24000;
-    if (!Begin(decoder, channels))
+    if (!Begin(decoder, channels, full))
         return false;
     if (decoder->warmChannels == channels && decoder->warmFull == full)
         return true;
-    return WarmUp(decoder, channels, full) && Begin(decoder, channels);
+    return WarmUp(decoder, channels, full) && Begin(decoder, channels, full);
 }
 
 // Hands the library the next frame. What it says is the same as if it had asked for that frame.
@@ -88,7 +86,7 @@ static int FeedFrame(SMp3Decoder* decoder)
     S32 size = 0;
     const U8* frame = decoder->frames.Next(&size);
     if (!frame)
-        return decoder->frames.Junk() > kJunkLimit ? MPG123_ERR : MPG123_NEED_MORE;
+        return decoder->frames.Spent() ? MPG123_ERR : MPG123_NEED_MORE;
     return mpg123_feed(decoder->handle, frame, static_cast<size_t>(size));
 }
 

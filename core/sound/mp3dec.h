@@ -11,7 +11,7 @@ enum SMp3Status : U32 {
     kMp3LastNotice = 0x41010002, // numbers up to here are no reason to stop
     kMp3NeedInput = 0x81010001,  // nothing more comes out until mp3decFill
     kMp3Ended = 0x81010004,      // the same, and mp3decSetInputEof was called
-    kMp3Failed = 0x8101FFFF,     // it cannot go on; also after 128 KiB of junk in a row
+    kMp3Failed = 0x8101FFFF,     // it cannot go on; also after 128 KiB of junk, less between frames
 };
 
 // A decoder, used by one thread at a time.
@@ -22,9 +22,9 @@ bool mp3decPresent();
 SMp3Decoder* mp3decOpen();
 // Back to the beginning of a stream: input and all that is remembered of earlier frames is
 // forgotten. The output is 16-bit native, of 1 or 2 channels, whatever the stream has; its rate is
-// the stream's. `rate` is what is expected of that, in Hz: memory for such frames is allocated by
-// the first reset that names it, and by nothing else while the stream is as it says. False: it
-// cannot go on.
+// the stream's. `rate` is what is expected of that, in Hz: frames of the size that goes with it
+// are decoded, others are junk. Memory for them is allocated by the first reset that names such a
+// rate, and by nothing else. False: it cannot go on.
 bool mp3decReset(SMp3Decoder* decoder, S32 channels, S32 rate);
 // Decodes up to `size` bytes, a multiple of 4, into `out`, and stores how many in `*got`.
 U32 mp3decDecode(SMp3Decoder* decoder, void* out, S32 size, S32* got);

@@ -127,4 +127,10 @@ TEST(Decoder, Mpeg)
     noise.insert(noise.end(), tone.begin(), tone.end());
     noise.insert(noise.end(), two.begin(), two.end());
     EXPECT_EQ(Decode(noise, 0x28), all);
+    EXPECT_EQ(Decode(two, 0x29).size(), 0u) << "frames of twice the samples";
+    // Between frames 4 bytes of junk a byte are borne, and 128 KiB of it more in all.
+    Bytes thin;
+    for (int i = 0; i < 5; ++i, thin.resize(thin.size() + 60000))
+        thin.insert(thin.end(), tone.begin(), tone.end());
+    EXPECT_EQ(Decode(thin, 0x28).size(), all.size() * (1 + 131072 / (60000 - 4 * tone.size())));
 }
