@@ -59,7 +59,15 @@ struct CSound {
     const U8* data = nullptr; // null: none
     S32 dataLen = 0;          // bytes
     S32 start = 0;            // MPEG: frames to pass over at the beginning
+    U64 movie = 0;            // whose definition it is; see SameSound
 
     // Back to no sound.
     void Init() { *this = CSound(); }
 };
+
+// Both come from one definition: its place in the data, in one movie's dictionary. Copies of a
+// movie share their data, and still each has sounds of its own.
+inline bool SameSound(const CSound& a, const CSound& b)
+{
+    return a.data == b.data && a.movie == b.movie;
+}

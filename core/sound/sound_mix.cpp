@@ -215,7 +215,7 @@ bool CSoundMix::Append(CSoundChannel* channel)
 bool CSoundMix::Plays(const CSound* sound) const
 {
     for (const CSoundChannel* c = channels; c; c = c->next)
-        if (!c->refill && c->sound.data == sound->data && !c->Removed())
+        if (!c->refill && SameSound(c->sound, *sound) && !c->Removed())
             return true;
     return false;
 }
@@ -223,7 +223,7 @@ bool CSoundMix::Plays(const CSound* sound) const
 void CSoundMix::MarkPlaying(const CSound* sound)
 {
     for (CSoundChannel* c = channels; c; c = c->next)
-        if (!c->refill && c->sound.data == sound->data)
+        if (!c->refill && SameSound(c->sound, *sound))
             c->Stop();
 }
 
@@ -289,7 +289,7 @@ void CSoundMix::RemoveAll()
 
 void CSoundMix::FreeSound(const CSound* sound)
 {
-    RemoveIf([=](const CSoundChannel& c) { return !c.refill && c.sound.data == sound->data; });
+    RemoveIf([=](const CSoundChannel& c) { return !c.refill && SameSound(c.sound, *sound); });
 }
 
 void CSoundMix::PurgeList()

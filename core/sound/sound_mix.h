@@ -76,7 +76,7 @@ public:
     void RemoveSound(CSoundChannel* channel);
     void RemoveTagged(U64 tag);
     void RemoveAll();
-    // The same for every channel that plays this sound: one with the same data.
+    // The same for every channel that plays this sound; see SameSound.
     void FreeSound(const CSound* sound);
     // Some channel plays this sound and is not marked.
     bool SoundPlaying(const CSound* sound);

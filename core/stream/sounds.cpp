@@ -40,6 +40,7 @@ bool SoundOf(const SCharacter* ch, CSound* sound)
     sound->data = ch->data;
     sound->dataLen = ch->sound.dataLen;
     sound->start = ch->sound.start;
+    sound->movie = ch->player->soundTag;
     return true;
 }
 

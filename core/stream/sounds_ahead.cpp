@@ -61,6 +61,7 @@ bool SoundsAhead::Free(const ScriptThread& timeline, U16 id)
     CSound sound;
     return !Find(timeline, id, &sound) || Change(id, false, CSound());
 }
+    sound.movie = timeline.player->soundTag;
 
 bool SoundsAhead::Start(const ScriptThread& timeline, U16 id)
 {
