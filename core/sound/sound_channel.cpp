@@ -24,13 +24,19 @@ S32 FrameCost(U8 format)
     }
 }
 
+// What a start may spend on the way to its in point, in the same units; some 15 ms. The rest is
+// passed over by the audio thread, a share in each buffer.
+constexpr S32 kPrepareBudget = 3 << 20;
+constexpr S32 kUnitsPerTag = 16;
+
 S32 RestartCost(const CSound& sound)
 {
     return 1 + FrameCost(sound.format) * (4096 + std::clamp(sound.start, 0, 32767));
 }
 
 // No more frames than the data can hold: a declared number can be anything. An MPEG frame
-// packs at most 24 into a byte; a few more do no harm.
+// packs at most 24 into a byte; a few more do no harm. A number that is too high all the same, as
+// that of MPEG data mostly can be, is played out in silence: each loop lasts as long as declared.
 S64 FramesInData(const CSound& sound)
 {
     const S64 bits = sound.data && sound.dataLen > 0 ? S64(sound.dataLen) * 8 : 0;
@@ -68,6 +74,24 @@ bool CSoundChannel::MakeDecomp()
     return decomp != nullptr;
 }
 
+// A decoder reaches an in point only by decoding up to it: done here, it delays no buffer.
+bool CSoundChannel::Prepare()
+{
+    if (prepared)
+        return true;
+    if (!Start() || !MakeDecomp())
+        return false;
+    S32 budget = kPrepareBudget;
+    if (!refill) {
+        decomp->Setup(&sound, true);
+        PassOver(&budget);
+    }
+    const S32 work = kPrepareBudget - budget + RestartCost(sound);
+    startCost += U32(work / kUnitsPerTag);
+    prepared = true;
+    return true;
+}
+
 void CSoundChannel::Release()
 {
     if (references.fetch_sub(1, std::memory_order_acq_rel) == 1)
@@ -76,13 +100,10 @@ void CSoundChannel::Release()
 
 // A stream without samples per picture could neither pace one nor be as long as one: it does not
 // play, and the clock rules.
-bool CSoundChannel::Start(S32 milliseconds)
+bool CSoundChannel::Start()
 {
-    if (refill) {
-        std::memset(counts, 0, sizeof counts);
-        Publish(S64(published.load(std::memory_order_relaxed) >> kClockBits), milliseconds);
+    if (refill)
         return sound.numSamples > 0;
-    }
     const int shift = SoundRateShift(sound.format);
     const S64 frames = std::min<S64>(sound.numSamples, FramesInData(sound));
     const S64 last = std::min<S64>(frames, outPoint >> shift);
@@ -92,6 +113,12 @@ bool CSoundChannel::Start(S32 milliseconds)
     end = S32(last);
     loopsLeft = loops;
     return true;
+}
+
+void CSoundChannel::StartCounting(S32 milliseconds)
+{
+    std::memset(counts, 0, sizeof counts);
+    Publish(S64(published.load(std::memory_order_relaxed) >> kClockBits), milliseconds);
 }
 
 void CSoundChannel::Publish(S64 samples, S32 milliseconds)

@@ -59,9 +59,12 @@ public:
 
     // Takes a reference; once, before it is added.
     void SetHolder(CSoundHolder* holder);
-    // Makes the decoder unless there is one. False: the sound cannot be played. AddSound does this,
-    // but a channel for AddSoundLocked must have got its decoder before.
-    bool MakeDecomp();
+    // Makes the decoder and brings an event sound to its in point, or as near as that may take, on
+    // the player's thread. AddSound does this, but a channel for AddSoundLocked must be prepared
+    // before. False: the sound cannot be played, or nothing lies between its points.
+    bool Prepare();
+    // What starting it was worth, in tags of a tick's budget; more if it was prepared.
+    U32 StartCost() const { return startCost; }
     // Where a stream starts in the count of samples heard, at the sound's rate.
     void SetSamplesPlayed(S64 samples) { Publish(samples, 0); }
 
@@ -97,8 +100,11 @@ private:
     CSoundChannel(const CSoundChannel&) = delete;
     CSoundChannel& operator=(const CSoundChannel&) = delete;
 
-    // Goes to the beginning. False: nothing would be heard.
-    bool Start(S32 milliseconds);
+    // Whether anything would be heard; an event sound then stands at its beginning.
+    bool Start();
+    // A stream's counts start at that time.
+    void StartCounting(S32 milliseconds);
+    bool MakeDecomp();
     // The next buffer's worth in the output's format into `out`, which holds 4096 samples; null:
     // not heard, goes on all the same. `budget`: what passing over samples may still cost.
     void Render(S16* out, U8 outFormat, S32 index, S32* budget);
@@ -132,6 +138,8 @@ private:
     S32 end = 0;
     S32 passLeft = 0;  // still to be passed over before the first frame is heard
     S32 loopsLeft = 0; // this one included
+    bool prepared = false;
+    U32 startCost = 16;
     bool havePrevious = false;
     S16 previous[2]{}; // the last frame of the block before, in the sound's format
 };

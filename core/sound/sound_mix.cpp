@@ -10,6 +10,9 @@ namespace {
 
 // What restarting loops may cost in one buffer, in samples of the cheapest decoder: some 10 ms.
 constexpr S32 kDecodeBudget = 1 << 20;
+// A device that was refused is not asked for again for so many ms: asking can take long.
+constexpr S32 kRefusalHolds = 2000;
+constexpr S32 kClockMask = 0x7FFFFFF;
 
 class CSoundLock {
 public:
@@ -77,6 +80,20 @@ bool CSoundMix::OpenDevice()
 {
     if (IsDeviceOpen())
         return true;
+    if (RefusedLately())
+        return false;
+    deviceRefused = !OpenNewDevice();
+    refusedAt = Clock();
+    return !deviceRefused;
+}
+
+bool CSoundMix::RefusedLately()
+{
+    return deviceRefused && ((Clock() - refusedAt) & kClockMask) < kRefusalHolds;
+}
+
+bool CSoundMix::OpenNewDevice()
+{
     CSound device;
     GetNativeSoundCap(&device.format);
     if (!OpenNativeDevice(&device))
@@ -170,13 +187,35 @@ bool CSoundMix::AddSound(CSoundChannel* channel)
         FreeSound(&channel->sound);
         return false;
     }
-    if (!channel->Start(Clock()) || !channel->MakeDecomp() || !OpenDevice())
+    // What is cheap comes first: a movie may ask for thousands of sounds that will not play.
+    const bool audible = channel->prepared || channel->Start();
+    if (!audible || !MayStart(*channel) || !channel->Prepare() || !OpenDevice())
         return false;
-    if (!channel->refill)
-        channel->decomp->Setup(&channel->sound, true);
     PurgeList();
     CSoundLock lock(this);
     return Append(channel);
+}
+
+bool CSoundMix::HasRoom()
+{
+    if (!IsDeviceOpen() && RefusedLately())
+        return false;
+    CSoundLock lock(this);
+    return NumLive() < gLimits.soundChannels;
+}
+
+bool CSoundMix::MayStart(const CSoundChannel& channel)
+{
+    const bool single = channel.syncFlags & kSyncNoMultiple && !channel.refill;
+    return HasRoom() && !(single && SoundPlaying(&channel.sound));
+}
+
+U32 CSoundMix::NumLive() const
+{
+    U32 live = 0;
+    for (const CSoundChannel* c = channels; c; c = c->next)
+        live += !c->Removed();
+    return live;
 }
 
 bool CSoundMix::AddSoundLocked(CSoundChannel* channel)
@@ -187,11 +226,7 @@ bool CSoundMix::AddSoundLocked(CSoundChannel* channel)
         MarkPlaying(&channel->sound);
         return false;
     }
-    if (!channel->decomp || !channel->Start(Clock()))
-        return false;
-    if (!channel->refill)
-        channel->decomp->Setup(&channel->sound, true);
-    return Append(channel);
+    return channel->prepared && Append(channel);
 }
 
 // At the end, so that a list being built from goes on to it.
@@ -199,12 +234,13 @@ bool CSoundMix::Append(CSoundChannel* channel)
 {
     if (channel->syncFlags & kSyncNoMultiple && !channel->refill && Plays(&channel->sound))
         return false;
-    U32 live = 0;
-    CSoundChannel** link = &channels;
-    for (; *link; link = &(*link)->next)
-        live += !(*link)->Removed();
-    if (live >= gLimits.soundChannels)
+    if (NumLive() >= gLimits.soundChannels)
         return false;
+    CSoundChannel** link = &channels;
+    while (*link)
+        link = &(*link)->next;
+    if (channel->refill)
+        channel->StartCounting(Clock());
     channel->AddRef();
     channel->mixer = this;
     channel->next = nullptr;

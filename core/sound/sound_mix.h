@@ -50,8 +50,12 @@ public:
     void Construct();
     // Removes all sounds, closes the device, frees the buffers.
     void Destruct();
-    // True when the device is open, now or already.
+    // True when the device is open, now or already. One that was refused is asked for again only
+    // after 2 seconds.
     bool OpenDevice();
+    // The device could not be had when it was last wanted: there is no sound, and the clock paces.
+    // For the shell, to tell its user.
+    bool DeviceRefused() const { return deviceRefused; }
     void CloseDevice();
     // Makes the buffers for the output format; while the device is closed.
     bool AllocBuffers();
@@ -70,7 +74,9 @@ public:
     // only stopped another, its format is unknown, nothing lies between its points, too many play,
     // or there is no device.
     bool AddSound(CSoundChannel* channel);
-    // The same with the lock held, for a refill: the channel has its decoder, the device is open.
+    // False: AddSound would refuse any sound now, since too many play or the device was refused.
+    bool HasRoom();
+    // AddSound with the lock held, for a refill: the channel is prepared, the device is open.
     bool AddSoundLocked(CSoundChannel* channel);
     // These three stop sounds; when they return, no callback uses those any more.
     void RemoveSound(CSoundChannel* channel);
@@ -100,6 +106,10 @@ private:
     CSoundMix(const CSoundMix&) = delete;
     CSoundMix& operator=(const CSoundMix&) = delete;
 
+    bool OpenNewDevice();
+    bool RefusedLately();
+    bool MayStart(const CSoundChannel& channel);
+    U32 NumLive() const;
     S16* GetScratch();
     void PreFill();
     bool Append(CSoundChannel* channel);
@@ -115,6 +125,8 @@ private:
     std::atomic<S32> idleCount{0};
     S32 numBuffers = 2;
     bool firstOpen = true;
+    bool deviceRefused = false;
+    S32 refusedAt = 0;        // when the device was last asked for, ms
     S32 samplesPerBuffer = 0; // frames
     S32 bytesPerBuffer = 0;
     std::unique_ptr<S16[]> buffers[kMostSoundBuffers];

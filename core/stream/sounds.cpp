@@ -56,18 +56,20 @@ CSoundChannel* NewEventSound(const CSound& sound, MovieData* data, U64 tag, SPar
     return channel;
 }
 
-void StartEventSound(CSoundMix* mix, const SCharacter* ch, U64 tag, SParser* record)
+U32 StartEventSound(CSoundMix* mix, const SCharacter* ch, U64 tag, SParser* record)
 {
     CSound sound;
     if (!mix || !SoundOf(ch, &sound)) {
         GetSoundInfo(record, nullptr);
-        return;
+        return 0;
     }
     CSoundChannel* channel = NewEventSound(sound, ch->player->sharedScript, tag, record);
     if (!channel)
-        return;
+        return 0;
     mix->AddSound(channel);
+    const U32 cost = channel->StartCost();
     channel->Release();
+    return cost;
 }
 
 CSoundMix* ScriptThread::Mixer() const
@@ -87,7 +89,7 @@ void ScriptThread::StartSound()
     if (seeking || !player || (streamChannel && !streamChannel->Removed()))
         return;
     const SCharacter* ch = player->FindCharacter(GetWord());
-    StartEventSound(PlayingMixer(), ch, soundTag, this);
+    ChargeTags(StartEventSound(PlayingMixer(), ch, soundTag, this));
 }
 
 void ScriptThread::SoundStreamHead()
@@ -114,7 +116,8 @@ void ScriptThread::SoundStreamBlock()
 bool ScriptThread::StartStream(CSoundMix* mix)
 {
     const S64 heard = S64(std::max(curFrame, 0)) * streamSound.numSamples;
-    StreamReader* reader = heard < kMostSamples ? NewReader(mix) : nullptr;
+    const bool playable = heard < kMostSamples && mix->HasRoom();
+    StreamReader* reader = playable ? NewReader(mix) : nullptr;
     CSoundChannel* channel = reader ? new (std::nothrow) CSoundChannel : nullptr;
     if (channel) {
         channel->tag = soundTag;
@@ -128,6 +131,7 @@ bool ScriptThread::StartStream(CSoundMix* mix)
         soundResync = false;
     }
     const bool plays = channel && mix->AddSound(channel);
+    ChargeTags(channel ? channel->StartCost() : 0);
     if (plays) {
         streamChannel = channel;
         streamReader = reader;
@@ -144,7 +148,7 @@ StreamReader* ScriptThread::NewReader(CSoundMix* mix)
     StreamReader* reader =
         player->sharedScript ? new (std::nothrow) StreamReader(mix, *this) : nullptr;
     if (reader)
-        reader->Tend(*this);
+        ChargeTags(reader->Tend(*this));
     return reader;
 }
 

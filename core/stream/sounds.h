@@ -21,5 +21,6 @@ bool SoundOf(const SCharacter* ch, CSound* sound);
 CSoundChannel* NewEventSound(const CSound& sound, MovieData* data, U64 tag, SParser* record);
 
 // Starts the character's sound, or stops it, as the record says. Nothing happens when there is no
-// mixer or the character is no sound (null is allowed); the record is passed over then.
-void StartEventSound(CSoundMix* mix, const SCharacter* ch, U64 tag, SParser* record);
+// mixer or the character is no sound (null is allowed); the record is passed over then. Returns
+// what that was worth, in tags of the tick's budget.
+U32 StartEventSound(CSoundMix* mix, const SCharacter* ch, U64 tag, SParser* record);

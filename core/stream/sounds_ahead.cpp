@@ -1,12 +1,17 @@
 #include "core/stream/sounds_ahead.h"
 
+#include <algorithm>
+
 #include "core/player/player.h"
 #include "core/sound/sound_mix.h"
 #include "core/stream/movie_data.h"
 #include "core/stream/sounds.h"
 #include "core/stream/tags.h"
 
-SoundsAhead::SoundsAhead(const ScriptThread& timeline) : tags(timeline, timeline.tagStart) {}
+SoundsAhead::SoundsAhead(const ScriptThread& timeline) : tags(timeline, timeline.tagStart)
+{
+    std::fill(chains, chains + kChains, kNone);
+}
 
 SoundsAhead::~SoundsAhead()
 {
@@ -15,19 +20,22 @@ SoundsAhead::~SoundsAhead()
         ready[released++ % kMostReady].channel->Release();
 }
 
-void SoundsAhead::Prepare(const ScriptThread& timeline)
+U32 SoundsAhead::Prepare(const ScriptThread& timeline)
 {
     ReleaseTaken();
     ForgetChanges(timeline.pos);
+    work = 0;
     for (U32 i = 0; i < kTagsPerGo && tags.GetTag(timeline.len) > kTagEnd; i++) {
+        work++;
         if (!ReadTag(timeline)) {
             tags.pos = tags.tagStart;
-            return;
+            return work;
         }
         tags.pos = tags.tagEnd;
     }
     if (tags.tagCode == kTagEnd)
         tags.pos = tags.tagStart;
+    return work;
 }
 
 // False: no room for it yet; it is to be read again.
@@ -53,6 +61,7 @@ bool SoundsAhead::Define(const ScriptThread& timeline, U16 id)
     CSound sound;
     if (known || id >= kIdFirstReserved || !GetSoundBody(&tags, &sound))
         return true;
+    sound.movie = timeline.player->soundTag;
     return Change(id, true, sound);
 }
 
@@ -61,7 +70,6 @@ bool SoundsAhead::Free(const ScriptThread& timeline, U16 id)
     CSound sound;
     return !Find(timeline, id, &sound) || Change(id, false, CSound());
 }
-    sound.movie = timeline.player->soundTag;
 
 bool SoundsAhead::Start(const ScriptThread& timeline, U16 id)
 {
@@ -75,10 +83,11 @@ bool SoundsAhead::Start(const ScriptThread& timeline, U16 id)
         NewEventSound(sound, timeline.player->sharedScript, timeline.soundTag, &tags);
     if (!channel)
         return true;
-    if (!channel->MakeDecomp()) {
+    if (!(channel->syncFlags & kSyncStop) && !channel->Prepare()) {
         channel->Release();
         return true;
     }
+    work += channel->StartCost();
     ready[next % kMostReady] = {tags.tagStart, channel};
     made.store(next + 1, std::memory_order_release);
     return true;
@@ -95,17 +104,27 @@ bool SoundsAhead::Find(const ScriptThread& timeline, U16 id, CSound* sound) cons
 
 bool SoundsAhead::Change(U16 id, bool defined, const CSound& sound)
 {
-    SChange* change = FindChange(id);
-    if (!change && numChanges < kMostChanges)
-        change = &changes[numChanges++];
-    if (change)
-        *change = {tags.tagStart, id, defined, sound};
-    return change != nullptr;
+    if (SChange* change = FindChange(id)) {
+        *change = {tags.tagStart, id, defined, change->next, sound};
+        return true;
+    }
+    const size_t count = changes.size();
+    if (count >= kMostChanges || !changes.Push({tags.tagStart, id, defined, kNone, sound}))
+        return false;
+    Chain(static_cast<U16>(count));
+    return true;
+}
+
+void SoundsAhead::Chain(U16 change)
+{
+    U16& first = chains[changes[change].id % kChains];
+    changes[change].next = first;
+    first = change;
 }
 
 SoundsAhead::SChange* SoundsAhead::FindChange(U16 id)
 {
-    for (U32 i = 0; i < numChanges; i++)
+    for (U16 i = chains[id % kChains]; i != kNone; i = changes[i].next)
         if (changes[i].id == id)
             return &changes[i];
     return nullptr;
@@ -119,12 +138,15 @@ const SoundsAhead::SChange* SoundsAhead::FindChange(U16 id) const
 // The timeline has run these tags itself by now.
 void SoundsAhead::ForgetChanges(S32 before)
 {
-    for (U32 i = 0; i < numChanges;) {
-        if (changes[i].place < before)
-            changes[i] = changes[--numChanges];
-        else
-            i++;
+    std::fill(chains, chains + kChains, kNone);
+    U16 kept = 0;
+    for (const SChange& change : changes) {
+        if (change.place < before)
+            continue;
+        changes[kept] = change;
+        Chain(kept++);
     }
+    changes.Truncate(kept);
 }
 
 void SoundsAhead::ReleaseTaken()

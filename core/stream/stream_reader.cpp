@@ -40,15 +40,16 @@ void StreamReader::Release()
         delete this;
 }
 
-void StreamReader::Tend(const ScriptThread& timeline)
+U32 StreamReader::Tend(const ScriptThread& timeline)
 {
     const SPlayer* player = timeline.splayer;
     const S64 seconds = player ? std::max(player->soundBufferTime, 0) : kLeadSeconds;
     const S32 delay = timeline.player->frameDelay;
     const S64 frames = seconds * 1000 / (delay > 0 ? delay : kNoDelay);
     lead.store(static_cast<S32>(std::min<S64>(frames, kS32Max)), std::memory_order_relaxed);
-    if (!player || player->soundOn)
-        ahead.Prepare(timeline);
+    const bool on = !player || player->soundOn;
+    soundOn.store(on, std::memory_order_relaxed);
+    return on ? ahead.Prepare(timeline) : 0;
 }
 
 bool StreamReader::ScriptStreamProc(CSoundChannel* channel, void* context)
@@ -117,7 +118,8 @@ StreamReader::Step StreamReader::ReadTag(CSoundChannel* channel)
     case kTagShowFrame:
         return ShowFrame();
     case kTagStartSound:
-        ahead.StartAt(tags.tagStart, mixer);
+        if (soundOn.load(std::memory_order_relaxed))
+            ahead.StartAt(tags.tagStart, mixer);
         return kGoOn;
     case kTagSoundStreamBlock:
         return brought ? kFrameDone : ReadBlock(channel);

@@ -22,9 +22,9 @@ public:
     void AddRef() override { references.fetch_add(1, std::memory_order_relaxed); }
     void Release() override;
 
-    // Once a tick, on the player's thread: makes event sounds ready and sets how much lead a
-    // waiting stream needs.
-    void Tend(const ScriptThread& timeline);
+    // Once a tick, on the player's thread: makes event sounds ready, sets how much lead a waiting
+    // stream needs and whether sounds are started. Returns what that was worth, in tags.
+    U32 Tend(const ScriptThread& timeline);
 
     // The channel's refill; `context` is the reader.
     static bool ScriptStreamProc(CSoundChannel* channel, void* context);
@@ -50,6 +50,7 @@ private:
     const S32 leadIn;    // MPEG: frames that the decoder needs before the first is heard
     SoundsAhead ahead;
     std::atomic<S32> lead{0}; // frames
+    std::atomic<bool> soundOn{true};
     std::atomic<S32> references{1};
 
     // The audio thread's:

@@ -6,6 +6,9 @@
 
 #include <gtest/gtest.h>
 
+#include "core/player/limits.h"
+#include "core/sound/sound_info.h"
+#include "core/stream/parser.h"
 #include "platform/headless/headless_sound.h"
 #include "platform/headless/native_player.h"
 
@@ -21,9 +24,14 @@ std::string Text(const S16* block, int format, S32 first, S32 count)
 
 struct TestMix : NativeSoundMix {
     explicit TestMix(int format) : cap(U8(format)) { OpenDevice(); }
+    bool OpenNativeDevice(CSound* f) override
+    {
+        return asked++, NativeSoundMix::OpenNativeDevice(f);
+    }
     void GetNativeSoundCap(U8* format) override { *format = cap; }
     std::string Play(S32 at, S32 count) { return Text(PlayBuffer(0), cap, at, count); }
     U8 cap;
+    int asked = 0; // for the device
 };
 
 // What a stream's refill brings.
@@ -44,12 +52,12 @@ struct Sound {
             f & 2 ? block[bytes / 2] = S16(n) : reinterpret_cast<U8*>(&block[0])[bytes] = U8(n);
         it->sound = {U8(f), kS32Max, reinterpret_cast<U8*>(&block[0]), bytes, 0};
         it->tag = tag;
-        it->MakeDecomp();
     }
     Sound(CSoundMix* m, Sound* e, std::deque<Step> s) : Sound(6, "", 9)
     {
         mix = m, met = e, steps = s;
         it->sound.numSamples = 100, it->refill = Refill, it->refillContext = this;
+        it->Prepare(), e->it->Prepare();
         it->decomp->Setup(&it->sound, true);
     }
     ~Sound() { it->Release(); }
@@ -162,6 +170,98 @@ TEST(Mixer, FlagsAndRemoval)
     EXPECT_EQ(" 1", mix.Play(0, 1));
     mix.FreeSound(&sounds[0].it->sound);
     EXPECT_EQ(" 0", mix.Play(0, 1));
+}
+
+// Movies may share data, and still stop their own sounds only.
+TEST(Mixer, SoundsOfTwoMoviesAreTwo)
+{
+    TestMix mix(14);
+    Sound one(14, "5"), other(14, "");
+    other.it->sound = one.it->sound, other.it->sound.movie = 1;
+    other.it->syncFlags = kSyncNoMultiple;
+    EXPECT_TRUE(mix.AddSound(one.it) && mix.AddSound(other.it));
+    mix.FreeSound(&one.it->sound);
+    EXPECT_TRUE(mix.SoundPlaying(&other.it->sound) && !mix.SoundPlaying(&one.it->sound));
+}
+
+// What will not play makes no decoder, and a device that is refused is asked for every 2 s.
+TEST(Mixer, StartsThatWillNotPlay)
+{
+    TestMix mix(14);
+    std::deque<Sound> sounds;
+    const auto add = [&](int flags) {
+        CSoundChannel* it = sounds.emplace_back(14, "").it;
+        it->sound = sounds[0].it->sound;
+        it->syncFlags = U8(flags);
+        const bool plays = mix.AddSound(it);
+        return std::to_string(plays) + (it->decomp ? "+" : "-");
+    };
+    EXPECT_EQ("1+", add(0));
+    EXPECT_EQ("0-", add(kSyncNoMultiple));
+    while (sounds.size() < gLimits.soundChannels + 1)
+        add(0);
+    EXPECT_EQ("0-", add(0));
+    mix.CloseDevice(), mix.RemoveAll();
+    mix.refuseDevice = true, mix.asked = 0;
+    std::string asked;
+    for (int s = 0; s < 5; s++, AdvanceHeadlessClock(1000000))
+        add(0), asked += add(0) + std::to_string(mix.asked) + " ";
+    EXPECT_EQ("0-1 0-1 0-2 0-2 0-3 ", asked);
+    mix.refuseDevice = false;
+    EXPECT_TRUE(mix.DeviceRefused() && !mix.HasRoom());
+    AdvanceHeadlessClock(1000000);
+    EXPECT_EQ("1+", add(0));
+    EXPECT_FALSE(mix.DeviceRefused());
+}
+
+// Far more than a buffer may pass over: 3 more a frame since the last of every 4096.
+TEST(Mixer, LateInPointIsHeardAtOnce)
+{
+    TestMix mix(14);
+    const std::vector<U8> data(1 << 20);
+    Sound late(14, "");
+    late.it->sound = {14 + kSoundAdpcm, kS32Max, data.data(), S32(data.size()), 0};
+    late.it->inPoint = 2500000;
+    EXPECT_TRUE(mix.AddSound(late.it));
+    EXPECT_EQ(" 4320 4323", mix.Play(0, 2));
+    EXPECT_LT(2500000u / 16, late.it->StartCost());
+}
+
+// All fields, none, and a record passed over.
+TEST(Mixer, StartRecord)
+{
+    struct : SParser {
+    } parser;
+    const U8 data[] = {0x3F, 1, 2, 0, 0, 5,    6,    7, 8,    9, 1,
+                       1,    3, 0, 0, 1, 0x34, 0x12, 2, 0x80, 0, 0xFF};
+    parser.Attach(data, sizeof data);
+    Sound sound(14, "");
+    const CSoundChannel& it = *sound.it;
+    GetSoundInfo(&parser, sound.it);
+    EXPECT_TRUE(parser.pos == 20 && it.syncFlags == 3 && it.inPoint == 0x201 && it.numPoints == 1);
+    EXPECT_TRUE(it.outPoint == 0x08070605 && it.loops == 0x109 && it.points[0].left == 0x1234);
+    EXPECT_TRUE(it.points[0].position == 0x01000003 && it.points[0].right == 0x8002);
+    GetSoundInfo(&parser, sound.it);
+    EXPECT_TRUE(parser.pos == 21 && it.syncFlags == 0 && it.inPoint == 0x201 && it.loops == 0x109);
+    parser.pos = 0, GetSoundInfo(&parser, nullptr);
+    EXPECT_EQ(20, parser.pos);
+}
+
+// Buffers end every 46.44 ms; what was not asked for in time, up to an hour, is made up for.
+TEST(Mixer, PulledByTheClock)
+{
+    SetHeadlessClock(5000000);
+    NativeSoundMix mix;
+    Sound sound(15, "7 8", 0);
+    mix.Record(), mix.AddSound(sound.it);
+    std::string buffers;
+    for (const S64 step :
+         std::vector<S64>{46439, 1, 46439, 1000000, -3000000, 46440, 3700000000, 46440}) {
+        AdvanceHeadlessClock(step), mix.Pump();
+        buffers += std::to_string(mix.Recording().size() / 4096) + " ";
+    }
+    EXPECT_EQ("0 1 1 23 23 24 24 25 ", buffers);
+    EXPECT_EQ(" 7 8 0", Text(mix.Recording().data(), 15, 0, 3));
 }
 
 // 512 frames a buffer: 10, 5 of silence, a picture frame's 100 of silence, 300, silence for ever.
