@@ -24,7 +24,7 @@ StreamReader::StreamReader(CSoundMix* mix, const ScriptThread& timeline)
     : mixer(mix), data(timeline.player->sharedScript),
       spriteLen(timeline.IsRoot() ? -1 : timeline.len), leadIn(timeline.streamSound.start),
       ahead(timeline), tags(timeline, timeline.tagStart), frame(timeline.curFrame),
-      budget(kMostBudget)
+      budget(kMostBudget), toDrop(leadIn)
 {
     data->AddRef();
 }
@@ -147,7 +147,6 @@ StreamReader::Step StreamReader::ReadBlock(CSoundChannel* channel)
     frameHadBlock = true;
     if (count == 0 && seek == 0)
         return kGoOn; // its sound came with the block before: not even silence
-    brought = true;
     channel->blockLeft = count;
     channel->silenceCount = seek;
     channel->block = channel->sound;
@@ -157,18 +156,20 @@ StreamReader::Step StreamReader::ReadBlock(CSoundChannel* channel)
     channel->decomp->Setup(&channel->block, false);
     if (mpeg)
         AdjustMp3Streaming(channel);
+    brought = channel->blockLeft > 0 || channel->silenceCount != 0;
     return kGoOn;
 }
 
 // A decoder that starts in the midst of a stream, or behind a gap, gives some samples that are not
-// yet the sound's.
+// yet the sound's. Blocks count them, so what is dropped is not waited for; a block that holds
+// nothing else is passed by.
 void StreamReader::AdjustMp3Streaming(CSoundChannel* channel)
 {
-    if (armed && channel->blockLeft > 0 && leadIn <= budget) {
-        channel->decomp->Decompress(nullptr, leadIn);
-        budget -= leadIn;
-        armed = false;
-    }
+    const S32 most = std::min({toDrop, channel->blockLeft, budget});
+    const S32 dropped = most > 0 ? channel->decomp->Decompress(nullptr, most) : 0;
+    toDrop -= dropped;
+    budget -= dropped;
+    channel->blockLeft -= dropped;
     if (channel->silenceCount < 0)
-        armed = true;
+        toDrop = leadIn;
 }

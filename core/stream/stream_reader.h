@@ -56,9 +56,9 @@ private:
     // The audio thread's:
     STagWalker tags;
     S32 frame;            // of the stream, counted as the timeline counts
-    S32 budget;           // tags, or passed-over samples, that may be read at once
+    S32 budget;           // tags, or samples of a lead-in, that may be read at once
     bool waiting = false; // for data
     bool brought = false; // this call has a block
     bool frameHadBlock = false;
-    bool armed = true; // the lead-in is due
+    S32 toDrop; // of the lead-in
 };
