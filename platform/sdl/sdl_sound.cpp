@@ -28,10 +28,18 @@ void NativeSoundMix::GetNativeSoundCap(U8* format)
     *format = 15;
 }
 
+// Said once, not at every further try.
+bool NativeSoundMix::Refused() const
+{
+    if (!DeviceRefused())
+        SDL_LogWarn(SDL_LOG_CATEGORY_AUDIO, "no sound: %s", SDL_GetError());
+    return false;
+}
+
 bool NativeSoundMix::OpenNativeDevice(CSound* format)
 {
     if (SDL_InitSubSystem(SDL_INIT_AUDIO) != 0)
-        return false;
+        return Refused();
     SDL_AudioSpec wanted = {};
     wanted.freq = SoundRate(format->format);
     wanted.format = AUDIO_S16SYS;
@@ -42,9 +50,11 @@ bool NativeSoundMix::OpenNativeDevice(CSound* format)
     rest = nullptr;
     restLength = 0;
     device = SDL_OpenAudioDevice(nullptr, 0, &wanted, nullptr, 0);
-    if (device == 0)
-        SDL_QuitSubSystem(SDL_INIT_AUDIO);
-    return device != 0;
+    if (device != 0)
+        return true;
+    Refused();
+    SDL_QuitSubSystem(SDL_INIT_AUDIO);
+    return false;
 }
 
 void NativeSoundMix::BuffersReady()

@@ -7,8 +7,8 @@
 
 // SDL's audio thread asks for bytes; it gets buffers as they are mixed, in whatever portions it
 // wants them. The device is opened with the first sound and closed by CSoundMix::CloseDevice; SDL
-// itself starts and ends with it, unless the shell holds on to it. Which driver plays is SDL's
-// choice (SDL_AUDIODRIVER).
+// itself starts and ends with it, unless the shell holds on to it. That there is none is logged.
+// Which driver plays is SDL's choice (SDL_AUDIODRIVER).
 class NativeSoundMix : public CSoundMix {
 public:
     // `milliseconds`: the player's clock, any thread may ask it.
@@ -29,6 +29,7 @@ public:
     S32 Clock() override { return clock(); }
 
 private:
+    bool Refused() const;
     static void Callback(void* mixer, U8* out, int length);
     void Write(U8* out, S32 length);
 

@@ -100,6 +100,7 @@ TEST(SdlSound, NoDeviceIsSaid)
     NativeSoundMix mix(Milliseconds);
     CSoundChannel* channel = NewChannel({1, 1}, false);
     EXPECT_FALSE(mix.AddSound(channel));
+    EXPECT_TRUE(mix.DeviceRefused());
     channel->Release();
 }
 
