@@ -18,8 +18,9 @@ extern "C" int LLVMFuzzerTestOneInput(const U8* data, size_t size)
     player.EndOfData();
     for (int tick = 0; tick < 8; ++tick) {
         player.Tick();
-        SPOINT middle = {128, 128};
+        SPOINT middle = {32, 32};
         player.scene.HitTest(&middle);
+        player.scene.SetButton(player.scene.HitButton(&middle), tick & 1);
     }
     player.GotoFrame(3);
     player.Tick();

@@ -3,6 +3,7 @@
 #include <cstdlib>
 
 #include "core/stream/movie_data.h"
+#include "core/stream/script_thread.h"
 
 namespace {
 constexpr U32 kFirstCapacity = 32;
@@ -34,6 +35,8 @@ void ActionList::PushAction(const U8* actions, const U8* body, const U8* end, Mo
         return;
     if (data)
         data->AddRef();
+    if (thread)
+        thread->actionsQueued = true;
     At(tail) = {actions, end, body, data, thread};
     tail++;
 }

@@ -16,25 +16,34 @@ struct SButtonRecord {
     ColorTransform cxform; // of the record, or of the button's own colour transform tag
 };
 
-// Walks the records of a button in order. Owns nothing; the character must stay.
+// Walks the records of a button in order, as many as the limits allow. Owns nothing; the character
+// must stay.
 class ButtonRecords : private SParser {
 public:
     explicit ButtonRecords(const SCharacter* button);
-    // The next record; false at the zero byte or at the end of the data.
+    // The next record; false at the zero byte or at the end of the data. The data of the character
+    // is all that is read.
     bool Next(SButtonRecord* record);
     // After the last record, in the first form of button: where the actions start.
     const U8* Actions() const;
 
 private:
-    const SCharacter* character;
+    void ReadColors(SButtonRecord* record);
+
+    const bool secondForm;
+    U32 count = 0; // of the records read
     struct CxformReader : SParser {
-    } colors; // the separate colour transforms of the first form
+    } colors;             // the separate colour transforms of the first form: one for each record,
+    ColorTransform color; // and the last one for all that are left
 };
 
 // One condition block of the second form.
 struct SButtonCondition {
     U16 word; // bit of each transition; from bit 9 on a key code, 0 for none
     const U8* actions;
+
+    bool On(int transition) const { return word >> transition & 1; }
+    int Key() const { return word >> 9; }
 };
 
 // Walks the chain of condition blocks of a button of the second form; empty for the first form.

@@ -1,7 +1,10 @@
 #include "core/display/display_list.h"
 
+#include <algorithm>
+
 #include "core/player/limits.h"
 #include "core/shape/character_parser.h"
+#include "core/sound/sound_mix.h"
 #include "core/stream/script_player.h"
 
 namespace {
@@ -44,6 +47,9 @@ DisplayList::~DisplayList()
 {
     DropHeld();
     root.FreeChildren();
+    ForgetIdentity();
+    if (soundMix)
+        soundMix->RemoveTagged(soundTag);
     while (threads) {
         ScriptThread* thread = threads;
         RemoveThread(thread);
@@ -110,7 +116,7 @@ void DisplayList::CalcUpdate()
 // A thread that is on the list already moves to the head.
 void DisplayList::AddThread(ScriptThread* thread)
 {
-    RemoveThread(thread);
+    UnlinkThread(thread);
     thread->nextThread = threads;
     if (threads)
         threads->prevThread = thread;
@@ -118,6 +124,29 @@ void DisplayList::AddThread(ScriptThread* thread)
 }
 
 void DisplayList::RemoveThread(ScriptThread* thread)
+{
+    DropActions(thread);
+    UnlinkThread(thread);
+}
+
+// A block that is running goes on without its timeline; a target that goes is one never chosen.
+void DisplayList::DropActions(ScriptThread* thread)
+{
+    if (thread->actionsQueued)
+        actions.RemoveThread(thread);
+    for (int i = 1; i <= calls.level; i++) {
+        SCallLevel& level = calls.levels[i];
+        if (level.target == thread) {
+            level.target = nullptr;
+            level.targetSet = false;
+        }
+        if (level.list && thread->actionsQueued)
+            level.list->RemoveThread(thread);
+    }
+    thread->actionsQueued = false;
+}
+
+void DisplayList::UnlinkThread(ScriptThread* thread)
 {
     if (threads != thread && !thread->prevThread)
         return;
@@ -149,11 +178,33 @@ void DisplayList::FreeCache()
     raster.FreeEmpties();
 }
 
-SObject* DisplayList::HitTest(const SPOINT* pt)
+void DisplayList::ChargeTags(U32 tags)
+{
+    tagsLeft -= std::min(tagsLeft, tags);
+}
+
+// Allows a hit test its budgets. `pt` in device units, however far away it is.
+SPOINT DisplayList::BeginHitTest(const SPOINT* pt)
 {
     recordsLeft = gLimits.shapeRecords;
     pixelsLeft = gLimits.decodedPixels;
+    const S64 scale = antialias ? 4 : 1;
+    return {Saturate32(pt->x * scale), Saturate32(pt->y * scale)};
+}
+
+SObject* DisplayList::HitTest(const SPOINT* pt)
+{
+    const SPOINT device = BeginHitTest(pt);
     SObject* hit = nullptr;
-    root.HitTest(hit, {camera, cameraCxform}, pt);
+    root.HitTest(hit, {camera, cameraCxform}, &device);
+    return hit;
+}
+
+SObject* DisplayList::HitButton(const SPOINT* pt)
+{
+    const SPOINT device = BeginHitTest(pt);
+    SObject* hit = nullptr;
+    if (RectPointIn(&devViewRect, &device))
+        root.HitButton(hit, {camera, cameraCxform}, &device);
     return hit;
 }

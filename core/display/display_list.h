@@ -76,7 +76,7 @@ public:
     SObject* objects = nullptr;      // all alive but the root, in the tree or on their way out
     ScriptThread* threads = nullptr; // every live timeline, newest first
     ScriptThread* threadCursor =
-        nullptr;               // next thread of the tick's walk; kept valid by RemoveThread
+        nullptr;                // next thread of the tick's walk; kept valid by RemoveThread
     SPlayer* splayer = nullptr; // whose list it is; null: no player
     ActionList actions;         // blocks that wait for DoActions
     SCallTable calls;           // what is running them
@@ -84,8 +84,8 @@ public:
     int buttonState = 1;        // of that button: 1 idle, 2 over, 3 down, 4 down outside
     int textUnderMouse = 0;     // the pointer is over a text field that can be selected in
     const U64 soundTag;         // of the sounds that buttons start; never used again
-    SRECT tabFocusRect;   // of the keyboard focus highlight; empty when none
-    int useFocusRect = 1; // the highlight is drawn
+    SRECT tabFocusRect;         // of the keyboard focus highlight; empty when none
+    int useFocusRect = 1;       // the highlight is drawn
     SButtonIdentity buttonIdentity = {};
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes all sounds; null: there are none
@@ -165,7 +165,8 @@ public:
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
-    // The topmost object of any kind under `pt` (pixels), or null.
+    // The topmost object of any kind under `pt` (pixels), or null. Objects lie where the last
+    // update saw them.
     SObject* HitTest(const SPOINT* pt);
     // The topmost button or selectable text field under `pt` (pixels), or null; null outside the
     // view.
@@ -180,6 +181,8 @@ public:
     void DoButtonStateTransition(SObject* obj, int code);
     // Queues the actions and starts the sound of a transition.
     void DoButtonAction(SObject* obj, int code);
+    // Queues a block of actions in a button's data, for the button's timeline.
+    void QueueButtonBlock(const SObject* obj, const U8* block);
 
     // Allows the next tick its full number of tags.
     void ResetBudget();
@@ -211,9 +214,16 @@ private:
     void NoteMask(const SObject* mask);
     void Empty(SObject* obj);
     void PlaceButtonChild(SObject* obj, const SButtonRecord& record);
-    void ChangeButton(SObject* obj, int newState, int code);
+    bool StepButton(SObject* under, bool down);
+    void ChangeButton(SObject* obj, int code);
     void TrackButton(SObject* obj);
+    void ForgetIdentity();
+    void QueueClick(const SObject* obj);
     void StartButtonSound(SObject* obj, int slot);
+    void ChargeTags(U32 tags);
+    SPOINT BeginHitTest(const SPOINT* pt);
+    void UnlinkThread(ScriptThread* thread);
+    void DropActions(ScriptThread* thread);
     void ClearRefs(const SObject* obj);
     SObject* Unlink(SObject** link);
     void Discard(SObject* obj);

@@ -4,6 +4,7 @@
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
+#include "core/player/player.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 
@@ -56,7 +57,7 @@ SObject** DisplayList::FindLink(SObject* parent, U16 depth)
         link = &(*link)->above;
         passed++;
     }
-    tagsLeft -= std::min(tagsLeft, passed / kSiblingsPerTag);
+    ChargeTags(passed / kSiblingsPerTag);
     return link;
 }
 
@@ -144,12 +145,12 @@ void DisplayList::StartObject(SObject* obj, const PlaceInfo* info)
 void DisplayList::StartButton(SObject* obj)
 {
     const SButtonIdentity& saved = buttonIdentity;
-    obj->state = 1;
-    if (saved.parent != obj->parent || saved.parentSerial != obj->parent->serial ||
-        saved.character != obj->character || saved.depth != obj->depth || saved.ratio != obj->ratio)
-        return;
-    button = obj;
-    obj->state = U8(buttonState);
+    const bool tracked = saved.parent == obj->parent && saved.parentSerial == obj->parent->serial &&
+                         saved.character == obj->character && saved.depth == obj->depth &&
+                         saved.ratio == obj->ratio;
+    if (tracked)
+        button = obj;
+    UpdateButton(obj, tracked ? buttonState : 1);
 }
 
 SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
@@ -238,6 +239,8 @@ void DisplayList::Discard(SObject* obj)
     obj->FreeChildren();
     if (button == obj)
         button = nullptr;
+    if (splayer)
+        splayer->BeforeRemoval(obj);
     ClearRefs(obj);
     obj->Free();
     *obj->aliveLink = obj->nextAlive;

@@ -116,6 +116,9 @@ private:
     SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);
     RColor* MaskColor() const;
     bool EdgesContain(const SPOINT* pt);
+    bool FieldContains(const MATRIX* placed, const SPOINT* pt) const;
+    bool ButtonContains(const STransform* placed, const SPOINT* pt);
+    bool AreaContains(SCharacter* area, const STransform* placed, const SPOINT* pt);
     bool TakeColorFlags();
     SObject* FirstBeyond(U16 maskDepth) const;
     void LeaveTimeline();

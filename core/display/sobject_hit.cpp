@@ -1,8 +1,11 @@
 // Hit tests: which object lies under a point.
 #include "core/display/display_list.h"
 #include "core/geom/curve.h"
+#include "core/stream/character.h"
 
 namespace {
+constexpr U32 kFieldNotSelectable = 0x1000; // of the flags that a text field's record begins with
+
 bool Crosses(const REdge* e, const SPOINT* pt)
 {
     if (pt->y < e->anchor1y || pt->y >= e->anchor2y)
@@ -40,6 +43,8 @@ void CountCrossing(const REdge* e)
 
 bool SObject::HitTestOne(const STransform* placed, const SPOINT* pt)
 {
+    if (character && character->type == kCharEditText)
+        return FieldContains(&placed->mat, pt);
     if (RectIsEmpty(&devBounds) || !RectPointIn(&devBounds, pt))
         return false;
     BuildNoted(placed);
@@ -68,6 +73,20 @@ bool SObject::TakeColorFlags()
         c->visible = 0;
     }
     return on;
+}
+
+// In its own coordinates: a field turned by a transform is not as large as its bounds on the
+// device.
+bool SObject::FieldContains(const MATRIX* placed, const SPOINT* pt) const
+{
+    const U32 flags = character->DataLen() < 2 ? 0u : character->data[0] | character->data[1] << 8u;
+    if (flags & kFieldNotSelectable)
+        return false;
+    MATRIX toField;
+    SPOINT inField;
+    MatrixInvert(placed, &toField);
+    MatrixTransformPoint(&toField, pt, &inField);
+    return !RectIsEmpty(&character->bounds) && RectPointIn(&character->bounds, &inField);
 }
 
 void SObject::HitTest(SObject*& hit, STransform placed, const SPOINT* pt)

@@ -157,6 +157,8 @@ void DisplayList::ForgetMovie(const ScriptPlayer* movie)
         if (obj->character && obj->character->player == movie)
             Empty(obj);
     }
+    if (buttonIdentity.character && buttonIdentity.character->player == movie)
+        ForgetIdentity();
     if (pending && pending->player == movie)
         pending = ExchangeForGone(pending);
     for (ScriptThread* thread = threads; thread; thread = thread->nextThread) {

@@ -39,6 +39,9 @@ struct SLimits {
     // Records and styles that shapes may read for one repaint or hit test. A shape that comes later
     // is not drawn this time.
     U32 shapeRecords = 8u << 20;
+    // Records of one button. Further ones, and with them the actions of the older form of button,
+    // are not there.
+    U32 buttonRecords = 4096;
     // Characters of one movie. Further definitions are ignored.
     U32 characters = 65536;
     // Bytes of one script string; a longer one is cut.

@@ -33,7 +33,9 @@ enum SReservedId : U16 {
 struct SButtonPart {
     const U8* sounds; // body of the button's sound record, null when none
     const U8* cxform; // body of the button's colour transform record, null when none
-    U8 trackAsMenu;
+    S32 soundsLen;    // bytes from there to the end of the tag
+    S32 cxformLen;
+    U8 trackAsMenu; // not 0: reacts to a pressed pointer that comes and goes
 };
 
 struct SFontPart {

@@ -223,8 +223,10 @@ void ScriptThread::DefineButtonExtra()
     if (!ch)
         return;
     const U8** record = isSound ? &ch->button.sounds : &ch->button.cxform;
-    if (!*record)
-        *record = script + pos;
+    if (*record)
+        return;
+    *record = script + pos;
+    (isSound ? ch->button.soundsLen : ch->button.cxformLen) = tagEnd > pos ? tagEnd - pos : 0;
 }
 
 void ScriptThread::FreeCharacter()

@@ -5,6 +5,7 @@
 
 #include "core/display/display_list.h"
 #include "core/player/limits.h"
+#include "core/player/player.h"
 #include "core/stream/script_player.h"
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
@@ -133,6 +134,9 @@ void ScriptThread::Dispatch()
     case kTagRemoveObject2:
         RemoveObject();
         break;
+    case kTagDoAction:
+        DoAction();
+        break;
     case kTagStartSound:
         StartSound();
         break;
@@ -147,6 +151,15 @@ void ScriptThread::Dispatch()
         DispatchDefinition();
         break;
     }
+}
+
+// The tag's body is queued as one block; it runs when the tick has drawn its frames.
+void ScriptThread::DoAction()
+{
+    if (seeking || !display || !player)
+        return;
+    const U8* body = script + pos;
+    display->actions.PushAction(body, body, script + tagEnd, player->sharedScript, this);
 }
 
 S32 ScriptThread::DoTags(S32 frame)
@@ -166,6 +179,17 @@ S32 ScriptThread::DrawFrame(S32 frame, bool seek)
         return kNeedsData;
     if (!rootObject && !MakeRootObject())
         return kDrawFailed;
+    SPlayer* keeper = splayer;
+    if (!keeper)
+        return RunTo(frame, seek);
+    keeper->focus.Save();
+    const S32 result = RunTo(frame, seek);
+    keeper->focus.Clear();
+    return result;
+}
+
+S32 ScriptThread::RunTo(S32 frame, bool seek)
+{
     if (seek && curFrame > frame)
         return SeekBack(frame);
     if (seek)

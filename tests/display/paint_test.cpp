@@ -48,10 +48,9 @@ TEST(Paint, Table)
         const Picture p = s.Shown();
         std::string colors, hits;
         for (int at = 0; at < 9; at++) {
-            const int x = at % 3 * 20 + 10, y = at / 3 * 20 + 10, unit = i % 2 ? 4 : 1;
-            const SPOINT pt = {x * unit, y * unit};
+            const SPOINT pt = {at % 3 * 20 + 10, at / 3 * 20 + 10};
             const SObject* hit = s.list.HitTest(&pt);
-            colors += letters.at(p.At(x, y));
+            colors += letters.at(p.At(pt.x, pt.y));
             hits += hit ? char('0' + hit->depth) : '.';
         }
         EXPECT_EQ(colors, c.colors) << c.what;
