@@ -149,8 +149,6 @@ void ScriptThread::CloneSprite(ScriptThread* src, const char* name, S32 depth)
     const SObject* source = src ? src->rootObject : nullptr;
     if (!source || !source->character || !rootObject || !display || !player)
         return;
-    if (depth < 0 || depth > 0xFFFF)
-        return;
     PlaceInfo info;
     CopyPlacement(source, &info);
     info.depth = static_cast<U16>(depth);
