@@ -28,7 +28,8 @@ void SPlayer::ChooseCamera()
     const bool fits =
         client.xmax <= CRaster::kMaxAntialiasSide && client.ymax <= CRaster::kMaxAntialiasSide;
     const bool zoomed = IsZoomed() && scaleMode != kScaleFixed;
-    scene.SetCamera(zoomed ? &zoomRect : &frame, &client, highQuality && fits, scaleMode);
+    if (scene.SetCamera(zoomed ? &zoomRect : &frame, &client, highQuality && fits, scaleMode))
+        FollowFocus();
 }
 
 void SPlayer::SetCamera(int update)

@@ -20,6 +20,7 @@ void SPlayer::DoPlay(int checkTime)
         DoActions();
     }
     RetestButtons();
+    FollowFocus();
     UpdateScreen();
     if (autoQuality)
         AdjustQuality(ClockElapsed(PlayerClock(), now), pace.frames);
@@ -46,8 +47,3 @@ void SPlayer::AdvanceThreads(const ScriptThread* pace)
             thread->DoFrame(1, false);
     }
 }
-
-// The place where buttons that move under a pointer at rest will change their state: tested at
-// mousePt, once mouseState is known, unless a press or a drag holds the mouse. Movies have no
-// buttons yet.
-void SPlayer::RetestButtons() {}

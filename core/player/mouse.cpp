@@ -1,0 +1,190 @@
+// The mouse: from the shell's events to buttons, drags and panning.
+#include "core/player/player.h"
+
+namespace {
+
+bool IsTextField(const SObject* obj)
+{
+    return obj != nullptr && obj->character->type == kCharEditText;
+}
+
+// Whether a press that began in a text field selects there. No field can be edited yet: focusText
+// is never set, and the pointer at a field only changes its shape.
+bool SelectsText(const SPlayer&)
+{
+    return false;
+}
+
+// The pointer during such a selection, until `mouseDown` is off.
+void DragSelection(SPlayer&, const SPOINT*, int) {}
+
+// Keeps text fields from the buttons' business: returns what is under the pointer for them.
+SObject* PointAtText(SPlayer* player, SObject* hit)
+{
+    player->scene.textUnderMouse = IsTextField(hit);
+    return IsTextField(hit) ? nullptr : hit;
+}
+
+// The tracked button goes idle; a pressed one is dragged off before it is released outside.
+bool LetGoOfButton(DisplayList* scene)
+{
+    const bool handled = scene->SetButton(nullptr, 0);
+    return (scene->button != nullptr && scene->SetButton(nullptr, 0)) || handled;
+}
+
+S32 DeviceUnits(S32 pixels, int antialias)
+{
+    return Saturate32(static_cast<S64>(pixels) * (antialias ? 4 : 1));
+}
+
+} // namespace
+
+// Every event has its own share of work, for its actions may go to other frames.
+bool SPlayer::BeginInput()
+{
+    if (!loaded || actionDepth > 0)
+        return false;
+    scene.ResetBudget();
+    return true;
+}
+
+void SPlayer::MouseDown(S32 x, S32 y)
+{
+    if (!BeginInput())
+        return;
+    const SPOINT pt = {x, y};
+    DoButton(&pt, 1, 1);
+    if (!loaded || scene.button != nullptr || SelectsText(*this) || !IsZoomed())
+        return;
+    panning = 1;
+    panStart = pt;
+}
+
+void SPlayer::MouseMove(S32 x, S32 y, int buttonDown)
+{
+    if (!BeginInput())
+        return;
+    const SPOINT pt = {x, y};
+    if (drag.object)
+        UpdateDragObject(&pt);
+    if (SelectsText(*this))
+        DragSelection(*this, &pt, 1);
+    else if (panning)
+        PanTo(&pt);
+    else
+        DoButton(&pt, buttonDown, 1);
+}
+
+// The release that ends panning is no click.
+void SPlayer::MouseUp(S32 x, S32 y)
+{
+    if (!BeginInput())
+        return;
+    const SPOINT pt = {x, y};
+    if (SelectsText(*this))
+        DragSelection(*this, &pt, 0);
+    else if (panning)
+        panning = 0;
+    else
+        DoButton(&pt, 0, 1);
+}
+
+void SPlayer::CancelCapture(int release)
+{
+    if (!BeginInput())
+        return;
+    panning = 0;
+    mouseState = release ? -1 : 0;
+    if (release && LetGoOfButton(&scene)) {
+        DoActions();
+        UpdateScreen();
+    }
+    UpdateCursor();
+}
+
+int SPlayer::GetCursorType() const
+{
+    if (scene.textUnderMouse)
+        return 3;
+    if (scene.button != nullptr)
+        return 2;
+    return IsZoomed() ? 1 : 0;
+}
+
+// The view follows the hand.
+void SPlayer::PanTo(const SPOINT* pt)
+{
+    Pan(Saturate32(static_cast<S64>(panStart.x) - pt->x),
+        Saturate32(static_cast<S64>(panStart.y) - pt->y));
+    panStart = *pt;
+}
+
+bool SPlayer::MouseIsHeld() const
+{
+    const bool pressed = scene.button != nullptr && scene.buttonState >= 3;
+    return drag.object || panning || SelectsText(*this) || pressed;
+}
+
+// Buttons that move under a pointer at rest change their state.
+void SPlayer::RetestButtons()
+{
+    if (mouseState < 0 || MouseIsHeld())
+        return;
+    const SPOINT pt = mousePt;
+    DoButton(&pt, mouseState != 0, 0);
+}
+
+// What a button makes of the pointer hides the keyboard's highlight, even in a tick.
+void SPlayer::DoButton(const SPOINT* pt, int mouseDown, int updateScreen)
+{
+    SObject* hit = PointAtText(this, scene.HitButton(pt));
+    if (scene.SetButton(hit, mouseDown)) {
+        HideFocus();
+        FinishButton(updateScreen);
+    }
+    if (loaded)
+        NotePointer(pt, mouseDown);
+}
+
+void SPlayer::DoButton(SObject* obj, int mouseDown, int updateScreen)
+{
+    if (scene.SetButton(obj, mouseDown))
+        FinishButton(updateScreen);
+}
+
+void SPlayer::FinishButton(int updateScreen)
+{
+    DoActions();
+    if (updateScreen)
+        UpdateScreen();
+    UpdateCursor();
+}
+
+void SPlayer::NotePointer(const SPOINT* pt, int mouseDown)
+{
+    const SPOINT dev = {DeviceUnits(pt->x, scene.antialias), DeviceUnits(pt->y, scene.antialias)};
+    if (!RectPointIn(&scene.devViewRect, &dev)) {
+        mouseState = -1;
+        return;
+    }
+    mouseState = mouseDown ? 1 : 0;
+    mousePt = *pt;
+}
+
+// A button does not heed a press unless the pointer was over it, so that comes first. The actions
+// of either half may remove the button.
+void SPlayer::ButtonEnter()
+{
+    ObjectRef obj(&scene, buttonFocus.object.Get());
+    if (!obj || obj.Get()->character->type != kCharButton)
+        return;
+    if (scene.button != obj.Get()) {
+        LetGoOfButton(&scene);
+        if (obj)
+            scene.DoButtonStateTransition(obj.Get(), 0);
+    }
+    if (obj)
+        DoButton(obj.Get(), 1, 1);
+    if (obj)
+        DoButton(obj.Get(), 0, 1);
+}
