@@ -117,12 +117,12 @@ void DisplayList::SetPlacement(SObject* obj, SObject* parent, const PlaceInfo* i
 void DisplayList::NameObject(SObject* obj, const PlaceInfo* info)
 {
     if (obj->character->type != kCharSprite || info->name) {
-        obj->name = CreateStr(info->name);
+        obj->SetName(info->name);
         return;
     }
     char name[24];
     std::snprintf(name, sizeof name, "instance%d", static_cast<int>(++instanceCount));
-    obj->name = CreateStr(name);
+    obj->SetName(name);
 }
 
 void DisplayList::StartObject(SObject* obj, const PlaceInfo* info)

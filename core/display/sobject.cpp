@@ -29,6 +29,14 @@ void SObject::Modify()
     display->needCalcUpdate = 1;
 }
 
+void SObject::SetName(const char* newName)
+{
+    char* copy = CreateStr(newName);
+    FreeStr(name);
+    name = copy;
+    nameHash = copy ? StrHash(copy) : 0;
+}
+
 void SObject::CalcUpdate(const MATRIX* parentMat, bool forced)
 {
     MATRIX mat;

@@ -33,7 +33,8 @@ struct SObject {
     SCharacter* character; // what is shown; null only for the root. Counted as a user of the record
     U16 depth;             // ordering key among siblings
     U16 ratio;             // morph ratio
-    char* name;            // instance name, owned; null when there is none
+    char* name;            // instance name, owned; null when there is none. Set by SetName only
+    U32 nameHash;          // of the name, for those who look for one among many; 0 for none
     ScriptThread* thread;  // a sprite's or movie's own timeline, else that of the parent
     STransform xform;      // relative to the parent
     SRECT devBounds;       // device units, valid after CalcUpdate
@@ -61,6 +62,8 @@ struct SObject {
 
     // To be called before every change of matrix, colour transform, character or ratio.
     void Modify();
+    // Takes a copy of a name, which may be its own; null for none.
+    void SetName(const char* newName);
     // Recalculates device bounds of what changed, here and below, and invalidates old and new
     // places.
     void CalcUpdate(const MATRIX* parentMat, bool forced);

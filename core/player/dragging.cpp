@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "core/player/limits.h"
 #include "core/stream/str.h"
 
 namespace {
@@ -13,6 +14,15 @@ void ParentToScene(const SObject* obj, MATRIX* mat)
     MatrixIdentity(mat);
     for (const SObject* p = obj->parent; p; p = p->parent)
         MatrixConcat(mat, &p->xform.mat, mat);
+}
+
+// What the last hit test may have cost: a look at each object, and the shapes that it read.
+U64 HitTestWork(const DisplayList& list)
+{
+    U64 work = gLimits.shapeRecords - list.recordsLeft;
+    for (const SObject* obj = list.objects; obj; obj = obj->nextAlive)
+        work++;
+    return work;
 }
 
 } // namespace
@@ -75,6 +85,7 @@ void SPlayer::UpdateDragObject(const SPOINT* pt)
     obj->xform.mat.ty = p.y;
     mousePt = *pt;
     UpdateDropTarget();
+    CheckUpdate(); // no tick needs to come: the object follows the pointer at once
 }
 
 // The object must not be found under itself, so it is hidden for the test.
@@ -85,8 +96,10 @@ void SPlayer::UpdateDropTarget()
         return;
     const U8 visible = obj->visible;
     obj->visible = 0;
+    scene.CalcUpdate(); // what has moved since the last repaint is hit where it is now
     SObject* hit = scene.HitTest(&mousePt);
     obj->visible = visible;
+    scriptWork += HitTestWork(scene);
     FreeStr(obj->dropTarget);
     obj->dropTarget = hit ? GetTargetPath(hit) : nullptr;
 }

@@ -199,9 +199,7 @@ void SPlayer::SetPropertyStr(ScriptThread* thread, int index, const char* value)
     SObject* obj = thread ? thread->rootObject : nullptr;
     double number;
     if (index == kPropName && obj) {
-        char* name = CreateStr(value); // before the old one goes: the value may be that very string
-        FreeStr(obj->name);
-        obj->name = name;
+        obj->SetName(value);
         obj->Modify();
     } else if (index != kPropName && ConvertStringToDouble(value, &number)) {
         SetProperty(thread, index, number);

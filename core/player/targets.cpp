@@ -62,10 +62,11 @@ SObject* MovieRoot(SObject* obj)
 // Only objects with a timeline of their own are found by name; of several the lowest.
 SObject* FindNamed(const SObject* parent, const char* name, U64* work)
 {
+    const U32 hash = StrHash(name);
     SObject* child = parent->bottomChild;
     for (; child; child = child->above) {
         ++*work;
-        if (child->OwnsThread() && StrEqual(child->name, name))
+        if (child->nameHash == hash && child->OwnsThread() && StrEqual(child->name, name))
             return child;
     }
     return nullptr;
