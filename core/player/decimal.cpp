@@ -156,6 +156,8 @@ BigNumber AllDigits(const SDecimal& decimal, int* exponent)
         big.MultiplyAdd(10, static_cast<U32>(*c - '0'));
         n++;
     }
+    while (c < decimal.end && (*c == '0' || *c == '.'))
+        c++;
     big.MultiplyAdd(10, c < decimal.end);
     *exponent -= n + 1 - SDecimal::kLeadDigits;
     return big;
