@@ -1,0 +1,243 @@
+// Runs the programs in tests/data/scripts. README.txt there says how they are written.
+#include "core/player/limits.h"
+#include "core/player/opcodes.h"
+#include "tests/player/player_scene.h"
+
+#include <bit>
+#include <fstream>
+#include <map>
+#include <regex>
+
+namespace {
+
+constexpr int kRootFrames = 6;
+
+struct Token {
+    char kind; // " text, < bytes in hexadecimal, or a word
+    std::string text;
+};
+using Tokens = std::vector<Token>;
+
+Tokens Split(const std::string& line)
+{
+    static const std::regex kToken(R"("([^"]*)\"|<([^>]*)>|#.*|\S+)"), kByte(R"(\\x(..))");
+    Tokens tokens;
+    for (std::sregex_iterator it(line.begin(), line.end(), kToken), end; it != end; ++it) {
+        const char kind = it->str()[0];
+        std::string text = kind == '"' ? it->str(1) : it->str();
+        if (kind == '<')
+            text = std::regex_replace(it->str(2), std::regex("(..) *"), "\\x$1");
+        for (std::smatch byte; std::regex_search(text, byte, kByte);)
+            text.replace(size_t(byte.position()), 4, 1, char(std::stoi(byte[1], nullptr, 16)));
+        if (kind != '#')
+            tokens.push_back({kind, text});
+    }
+    return tokens;
+}
+
+// The operands of records with a payload: w word, b byte, s string, j jump.
+const std::map<std::string, std::string> kOperands = {
+    {"GotoFrame", "w"},  {"GetURL", "ss"},      {"WaitForFrame", "wb"}, {"WaitForFrameExpr", "b"},
+    {"Jump", "j"},       {"If", "j"},           {"SetTarget", "s"},     {"GotoLabel", "s"},
+    {"GetURLExpr", "b"}, {"GotoFrameExpr", "b"}};
+
+// The first pass finds the labels.
+std::vector<U8> Assemble(const Tokens& tokens)
+{
+    std::map<std::string, size_t> labels;
+    ByteWriter code;
+    for (int pass = 0; pass < 2; pass++) {
+        code = {};
+        for (auto token = tokens.begin(); token != tokens.end(); ++token) {
+            const std::string text = token->text;
+            ByteWriter payload;
+            int op = kOpPush;
+            if (token->kind == '<') {
+                code.PutBytes({text.begin(), text.end()});
+                continue;
+            } else if (token->kind == '"') {
+                payload.PutU8(0).PutString(text);
+            } else if (text.back() == ':') {
+                labels[text] = code.Size();
+                continue;
+            } else if (isdigit(text[0]) || text[0] == '-') {
+                payload.PutU8(1).PutU32(std::bit_cast<U32>(std::stof(text)));
+            } else {
+                for (op = 0xFF; op >= 0 && (!OpcodeName(U8(op)) || text != OpcodeName(U8(op)));)
+                    op--;
+                EXPECT_GE(op, 0) << "no record is called " << text;
+                for (char kind : kOperands.count(text) ? kOperands.at(text) : "") {
+                    const std::string& word = (++token)->text;
+                    const bool label = kind == 'j' && isalpha(word[0]);
+                    const S32 number = kind == 's' ? 0
+                                       : label     ? S32(labels[word + ":"]) - S32(code.Size()) - 5
+                                                   : std::stoi(word, nullptr, 0);
+                    kind == 's'   ? payload.PutString(word)
+                    : kind == 'b' ? payload.PutU8(U32(number))
+                                  : payload.PutU16(U32(number));
+                }
+            }
+            code.PutU8(U32(op));
+            if (op >= kFirstOpWithPayload)
+                code.PutU16(U32(payload.Size())).PutBytes(payload.Bytes());
+        }
+    }
+    return code.Bytes();
+}
+
+struct Script {
+    std::string where;
+    std::map<std::string, Tokens> code = {}; // by timeline and frame, from 1
+    int framesLoaded = kRootFrames;
+    int level = 0; // one that plays the code for "level"
+    std::vector<Tokens> wanted = {};
+
+    TagWriter& Write(TagWriter* tags, const std::string& place, int frame) const
+    {
+        const auto block = code.find(place + " " + std::to_string(frame));
+        return block != code.end() ? tags->DoAction(Assemble(block->second)) : *tags;
+    }
+};
+
+std::vector<U8> MakeMovie(const Script& script, const std::string& root, int frames)
+{
+    const std::string labels[] = {"one", "mid", "three", "-x", "-5", "six"};
+    MovieWriter movie(2000, 2000, Fps(10), kRootFrames);
+    TagWriter a, b;
+    script.Write(&b, "b", 1).Place(1, 1).Show().End();
+    a.Place2(1, {.character = 2, .name = "b"});
+    for (int f = 1; f <= 3; f++)
+        script.Write(&a, "a", f).Label(labels[f - 1]).Show();
+    movie.DefineShape(1, Square()).DefineSprite(2, b).DefineSprite(3, a.End());
+    movie.Place2(1, {.character = 3, .name = "a"});
+    for (int f = 1; f <= frames; f++)
+        script.Write(&movie, root, f).Label(labels[f - 1]).Show();
+    return movie.Bytes();
+}
+
+// A shell that may unload everything in the middle of a record.
+class ScriptShell : public NativePlayerWnd {
+public:
+    using NativePlayerWnd::NativePlayerWnd;
+    void InvalidateScreenArea(const SRECT*) override
+    {
+        if (actionDepth > 0 && FindVariable("unload"))
+            ClearScript();
+    }
+};
+
+std::string Answer(ScriptShell* player, const std::string& what, const std::string& arg)
+{
+    ScriptValue value;
+    if (what == "stack")
+        return player->stack.Peek(U32(std::stoi(arg)))->Text();
+    if (what == "request") {
+        std::vector<HostRequest> all = player->Requests();
+        all.resize(40, {"no", "", "", "", "", ""});
+        const HostRequest& r = all[size_t(std::stoi(arg)) - 1];
+        return r.kind + " " + r.url + " " + r.window + (r.data.empty() ? "" : " " + r.data);
+    }
+    if (what == "var")
+        return player->GetVariable(player, arg.c_str(), &value) ? value.Text() : "absent";
+    const ScriptThread* thread = player->FindTarget(nullptr, arg.c_str());
+    const std::map<std::string, int> numbers = {
+        {"aborted", player->actionsAborted},
+        {"frame", thread ? thread->curFrame + 1 : 0},
+        {"playing", thread ? thread->playing : 0},
+        {"there", thread != nullptr},
+        {"dragged",
+         thread && player->drag.object && player->drag.object.Get() == thread->rootObject}};
+    return std::to_string(numbers.at(what));
+}
+
+void Check(ScriptShell* player, const Tokens& want)
+{
+    const bool stack = want[0].text == "stack";
+    ASSERT_TRUE(!stack || player->stack.Count() == want.size() - 1) << player->stack.Count();
+    for (size_t i = stack ? 1 : 2; i < want.size(); i++) {
+        const std::string arg = stack ? std::to_string(want.size() - 1 - i) : want[1].text;
+        EXPECT_EQ(Answer(player, want[0].text, arg), want[i].text) << want[0].text << " " << arg;
+    }
+}
+
+// The clock stands at 250 ms, and the player was made at 0. A tracer sees each value as text.
+void Play(const Script& script, bool traced)
+{
+    SCOPED_TRACE(script.where);
+    SetHeadlessClock(0);
+    ScriptShell player(100, 100);
+    SetHeadlessClock(250000);
+    if (traced)
+        player.tracer.record = [](void*, ScriptThread*, const SActionRecord&, ValueStack& stack) {
+            for (U32 i = 0; i < 2 && stack.Peek(i); i++)
+                stack.Peek(i)->Text();
+        };
+    const std::vector<U8> movie = MakeMovie(script, "root", kRootFrames);
+    const size_t loaded = MakeMovie(script, "root", script.framesLoaded).size();
+    player.Feed(movie.data(), loaded);
+    if (script.level != 0) {
+        const std::vector<U8> more = MakeMovie(script, "level", kRootFrames);
+        ScriptPlayer* level = player.OpenLayer(script.level, 0);
+        level->PushDataBuf(more.data(), S32(more.size()));
+        level->DrawFrame(0, true);
+        player.DoActions();
+    }
+    EXPECT_EQ(player.scene.calls.level, 0);
+    for (const Tokens& want : script.wanted)
+        Check(&player, want);
+    player.DoPlay(0); // and on it goes
+}
+
+void Append(Tokens* to, const Tokens& more)
+{
+    to->insert(to->end(), more.begin(), more.end());
+}
+
+std::vector<Script> Read(const std::string& file)
+{
+    std::vector<Script> scripts;
+    std::string place, line;
+    std::ifstream in(file);
+    for (int n = 1; std::getline(in, line); n++) {
+        const Tokens tokens = Split(line);
+        const std::string verb = tokens.empty() ? "test" : tokens[0].text;
+        const size_t arrow = verb == "=" ? std::string::npos : line.find(" ->");
+        if ((verb == "test" && !tokens.empty()) || arrow != std::string::npos) {
+            scripts.push_back({file + ":" + std::to_string(n)});
+            place = "root 1";
+        }
+        if (arrow != std::string::npos) {
+            Append(&scripts.back().code[place], Split(line.substr(0, arrow)));
+            scripts.back().wanted.push_back(Split("stack " + line.substr(arrow + 3)));
+        } else if (verb == "on") {
+            place = tokens.at(1).text + " " + tokens.at(2).text;
+        } else if (verb == "loaded" || verb == "level") {
+            Script& script = scripts.back();
+            (verb == "level" ? script.level : script.framesLoaded) = std::stoi(tokens.at(1).text);
+        } else if (verb == "=") {
+            scripts.back().wanted.emplace_back(tokens.begin() + 1, tokens.end());
+        } else if (verb != "test") {
+            Append(&scripts.back().code[place], tokens);
+        }
+    }
+    return scripts;
+}
+
+} // namespace
+
+// Nobody can tell numbers from their text: with someone who looks at them it all ends the same.
+TEST(Scripts, LeaveWhatTheirFilesSay)
+{
+    const SLimits kept = gLimits;
+    gLimits.workPerRun = 1u << 22;
+    for (const char* name : {"values", "flow", "timelines", "sprites", "removal", "urls"}) {
+        const std::vector<Script> scripts =
+            Read(std::string(VEXEL_SOURCE_DIR "/tests/data/scripts/") + name + ".txt");
+        EXPECT_FALSE(scripts.empty()) << name;
+        for (const Script& script : scripts) {
+            Play(script, false);
+            Play(script, true);
+        }
+    }
+    gLimits = kept;
+}
