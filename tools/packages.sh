@@ -15,10 +15,12 @@ missing_packages() {
         pkg-config --exists zlib || echo zlib1g-dev
         pkg-config --exists libjpeg || echo libjpeg-dev
         pkg-config --exists libmpg123 || echo libmpg123-dev
+        pkg-config --exists libcurl || echo libcurl4-openssl-dev
         [[ ${1:-} != test ]] || pkg-config --exists gtest || echo libgtest-dev
         [[ ${1:-} != test ]] || pkg-config --exists sdl2 || echo libsdl2-dev
     else
-        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev ${1:+libgtest-dev libsdl2-dev}
+        echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev libcurl4-openssl-dev \
+            ${1:+libgtest-dev libsdl2-dev}
     fi
 }
 

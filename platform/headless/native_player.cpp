@@ -44,19 +44,42 @@ NativePlayerWnd::NativePlayerWnd(S32 pixelWidth, S32 pixelHeight)
 NativePlayerWnd::~NativePlayerWnd()
 {
     ClearScript();
+    requests.Shutdown();
+    StreamInDestroy(&fed);
+}
+
+void NativePlayerWnd::SetMovieFile(const std::string& path)
+{
+    movieURL = FileURL(path);
+}
+
+// The movie that is fed comes in like any first movie, but for its size: that is known here before
+// its first frame is shown.
+void NativePlayerWnd::StartFeeding()
+{
+    feeding = true;
+    sizeReported = false;
+    startedOnce = false;
+    firstLoad = 1;
+    requests.ForgetRoot();
+    requests.policy.SetOrigin(movieURL);
+    StreamInNew(&fed, movieURL.c_str(), nullptr);
+    fed.reportSize = 0;
 }
 
 void NativePlayerWnd::Feed(const U8* data, size_t n)
 {
-    while (n > 0) {
+    if (n > 0 && !feeding)
+        StartFeeding();
+    while (n > 0 && fed.player == this) {
         const size_t block = n < kLargestBlock ? n : kLargestBlock;
-        sizeReported = sizeReported && gotHeader; // of the movie before this one
         PushDataBuf(data, static_cast<S32>(block));
         if (gotHeader && !sizeReported) {
             sizeReported = true;
             AdjustWindow(PixelsOf(frame.xmin, frame.xmax), PixelsOf(frame.ymin, frame.ymax));
         }
         PushDataComplete();
+        startedOnce = startedOnce || Started();
         data += block;
         n -= block;
     }
@@ -64,18 +87,26 @@ void NativePlayerWnd::Feed(const U8* data, size_t n)
 
 void NativePlayerWnd::EndOfData()
 {
-    SetDataComplete();
+    feeding = false;
+    StreamInDestroy(&fed);
+}
+
+void NativePlayerWnd::Deliver()
+{
+    requests.Deliver();
+    startedOnce = startedOnce || Started();
 }
 
 bool NativePlayerWnd::CanTick() const
 {
-    if (!Started())
-        return false;
+    if (!Started() || requests.LoadedRoot())
+        return startedOnce;
     return !playing || Complete() || FrameAvailable(curFrame + 1);
 }
 
 void NativePlayerWnd::Tick()
 {
+    Deliver();
     AdvanceHeadlessClock(static_cast<S64>(frameDelay) * 1000);
     if (mixer)
         mixer->Pump();
@@ -154,13 +185,26 @@ void NativePlayerWnd::BltToScreen(const SRECT* r)
 
 void NativePlayerWnd::ClearScreen() {}
 
-void NativePlayerWnd::StreamPostURLNotify(const char*, const char*, U32, const char*, void*) {}
+void NativePlayerWnd::StreamPostURLNotify(const char* url, const char* target, U32 length,
+                                          const char* data, void* notifyData)
+{
+    requests.Ask(url, target, data, length, notifyData);
+}
 
-void NativePlayerWnd::StreamGetURLNotify(const char*, const char*, void*) {}
+void NativePlayerWnd::StreamGetURLNotify(const char* url, const char* target, void* notifyData)
+{
+    requests.Ask(url, target, nullptr, 0, notifyData);
+}
 
-void NativePlayerWnd::CloseStream(StreamData*) {}
+void NativePlayerWnd::CloseStream(StreamData* closed)
+{
+    requests.Close(closed);
+}
 
-void NativePlayerWnd::ProcessFSCommand(const char*, const char*) {}
+void NativePlayerWnd::ProcessFSCommand(const char* command, const char* args)
+{
+    requests.Command(command, args);
+}
 
 void NativePlayerWnd::EnableMenus(const MenuStatus&) {}
 

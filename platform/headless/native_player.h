@@ -4,6 +4,11 @@
 #pragma once
 
 #include "core/player/player.h"
+#include "core/player/stream_data.h"
+#include "platform/headless/host_requests.h"
+
+#include <string>
+#include <vector>
 
 class NativeSoundMix;
 
@@ -18,16 +23,30 @@ public:
     NativePlayerWnd(S32 width, S32 height);
     ~NativePlayerWnd() override;
 
-    // Bytes of the root movie, in any portions; then the end of the stream.
+    // Bytes of the root movie, in any portions; then the end of the stream. Bytes of a movie that
+    // has been unloaded meanwhile are ignored.
     void Feed(const U8* data, size_t n);
     void EndOfData();
+
+    // The file that Feed's bytes are from: what the movie names is looked for around it, and it may
+    // read what lies there. Before any data; without it the movie reaches nothing.
+    void SetMovieFile(const std::string& path);
+    // Wider permission for movies: the network, and the files of a folder; false when it is none.
+    void AllowNet() { requests.policy.AllowNet(); }
+    bool AllowDir(const std::string& dir) { return requests.policy.AllowDir(dir); }
+    // Brings what movies have asked for. Tick begins with it; without ticks, as after ControlOpen,
+    // the caller does it.
+    void Deliver();
+    // What movies have asked for, in order: all of it, refused or not.
+    const std::vector<HostRequest>& Requests() const { return requests.All(); }
 
     // Picture 1 is on the screen: frame 0 has been shown.
     bool Started() const { return loaded != 0; }
     // The next tick can show what it should: the root timeline has the data of its next frame, or
-    // needs none.
+    // needs none, or its data is not Feed's. A movie that has unloaded itself may be ticked.
     bool CanTick() const;
-    // Advances the clock by one frame delay, has the mixer play as far as that, and plays one tick.
+    // Delivers, advances the clock by one frame delay, has the mixer play as far as that, and plays
+    // one tick.
     void Tick();
     // Its sounds go to that mixer, which must outlive it; before any data.
     void PlayThrough(NativeSoundMix* mix);
@@ -66,10 +85,17 @@ public:
     SRECT invalidated; // the same for InvalidateScreenArea
 
 private:
+    void StartFeeding();
+
     S32 width;
     S32 height;
     bool ownSize; // the area follows the movie
     bool sizeReported = false;
+    bool startedOnce = false; // the movie that was fed, or one in its place
+    bool feeding = false;     // a movie is being fed, wanted or not
+    StreamData fed;
+    std::string movieURL;
+    HostRequests requests{this};
     bool paints = true;
     NativeSoundMix* mixer = nullptr; // not owned; null: Tick has none to pump
     bool timerRuns = false;
