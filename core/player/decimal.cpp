@@ -10,9 +10,9 @@ namespace {
 // count of how far the product can be off. In the rare case that this leaves two results possible,
 // big numbers decide.
 
+// The lowest mantissa bit of a double with the exponent field E counts 2^(E - kExponentBias).
 constexpr int kMantissaBits = 52;
-constexpr int kExponentBias =
-    1075; // the lowest bit of a double with exponent field E counts 2^(E-1075)
+constexpr int kExponentBias = 1075;
 constexpr int kLowestExponent = -1074;
 constexpr U64 kHiddenBit = U64{1} << kMantissaBits;
 constexpr U64 kInfinityBits = U64{0x7FF} << kMantissaBits;
@@ -31,7 +31,7 @@ constexpr SScaled TopBits(const BigNumber& big, int exponent)
     return {big.Extract(low), low + exponent, 0};
 }
 
-constexpr int kFinePowers = 26;   // 5^25 is the last that is exact by far in 64 bits
+constexpr int kFinePowers = 26;   // 5^25 is exact in 64 bits
 constexpr int kCoarseFirst = -14; // 10^-364
 constexpr int kCoarsePowers = 28; // up to 10^338
 
