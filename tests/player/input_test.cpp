@@ -34,14 +34,14 @@ struct Stage : MovieWriter {
         square.Styles(0, square.AddFill(Rgba{9, 9, 9})).Rect(0, 0, 20 * kPixel, 20 * kPixel);
         Background({255, 255, 255, 255}).DefineShape(1, square).DoAction({0x07, 0});
     }
-    Stage& Button(U16 id, const std::vector<ButtonBlock>& blocks = {})
+    Stage& Button(U16 id, const ButtonBlocks& blocks = {})
     {
-        return static_cast<Stage&>(DefineButton2(id, {{0x0F, 1, 1}}, blocks));
+        return static_cast<Stage&>(DefineButton(id, kTagDefineButton2, {{0x0F, 1, 1}}, blocks));
     }
     // Says its name and the number of every transition.
     Stage& Teller(U16 id, const std::string& name)
     {
-        std::vector<ButtonBlock> blocks;
+        ButtonBlocks blocks;
         for (U32 i = 0; i < 9; i++)
             blocks.push_back({1u << i, Say(name + std::to_string(i))});
         return Button(id, blocks);
