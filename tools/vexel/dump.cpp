@@ -1,5 +1,6 @@
-// `vexel dump`: every tag of a movie, one a line.
+// `vexel dump`: every tag and action of a movie, one a line.
 #include "core/stream/tags.h"
+#include "tools/vexel/action_dump.h"
 #include "tools/vexel/arguments.h"
 #include "tools/vexel/commands.h"
 #include "tools/vexel/message.h"
@@ -20,6 +21,7 @@ void PrintTags(TagReader reader, int depth)
         std::printf("%8d  %*s%s code=%d length=%d%s\n", reader.tagStart, 2 * depth, "",
                     TagTitle(reader.tagCode).c_str(), reader.tagCode, reader.Length(),
                     TagFields(&reader).c_str());
+        PrintActions(&reader, 2 * depth + 2);
         constexpr S32 kSpriteHead = 4; // id and frame count
         if (reader.tagCode == kTagDefineSprite && depth < kDeepest && reader.Length() > kSpriteHead)
             PrintTags(TagReader(reader.script, reader.bodyStart + kSpriteHead, reader.tagEnd),

@@ -166,6 +166,12 @@ std::string SpriteFields(TagReader& tag)
     return id + WordField(tag, "frames");
 }
 
+std::string Button2Fields(TagReader& tag)
+{
+    const std::string id = WordField(tag, "id");
+    return tag.GetByte() != 0 ? id + " menu" : id;
+}
+
 std::string ButtonCxformFields(TagReader& tag)
 {
     const std::string id = WordField(tag, "id");
@@ -211,6 +217,8 @@ std::string Decode(TagReader& tag)
         return StreamHeadFields(tag);
     case kTagDefineSprite:
         return SpriteFields(tag);
+    case kTagDefineButton2:
+        return Button2Fields(tag);
     case kTagDefineButtonCxform:
         return ButtonCxformFields(tag);
     case kTagFrameLabel:
@@ -220,7 +228,6 @@ std::string Decode(TagReader& tag)
     case kTagDefineBitsJPEG2:
     case kTagDefineBitsJPEG3:
     case kTagDefineButton:
-    case kTagDefineButton2:
     case kTagDefineButtonSound:
     case kTagStartSound:
         return WordField(tag, "id");
