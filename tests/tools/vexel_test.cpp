@@ -24,7 +24,7 @@ TEST_F(Tool, SaysOneLineAboutAnError)
         {"$vexel render ../m", 2, "needs an output"},
         {"$vexel render -o x.png", 2, "one movie"},
         {"$vexel render ../m -o", 2, "-o needs a value"},
-        {"$vexel render ../m -o x.png --allow-net", 2, "unknown option --allow-net"},
+        {"$vexel render ../m -o x.png --allow", 2, "unknown option --allow"},
         {"$vexel render ../m -o x.png --progress=yes", 2, "--progress takes no value"},
         {"$vexel render ../m -o x.BMP", 2, "no format goes by the extension .bmp: png, gif"},
         {"$vexel render ../m -o a.png/x", 2, "without extension"},
@@ -98,7 +98,7 @@ TEST_F(Tool, Lists)
     Write("../m", Sampler());
     const std::pair<const char*, std::vector<const char*>> cases[] = {
         {"$vexel --version", {"vexel 0."}},
-        {"$vexel --help", {"vexel render", "vexel info", "vexel dump", "--background"}},
+        {"$vexel --help", {"vexel render", "vexel state", "vexel info", "vexel dump", "--background"}},
         {"$vexel dump ../m",
          {"       0  header version=5", "frame=0,11000,0,8000 rate=12.5 frames=3\n",
           "      21  SetBackgroundColor code=9 length=3 color=#ff0010\n",

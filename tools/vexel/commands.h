@@ -4,5 +4,6 @@
 #include <span>
 
 int RenderCommand(std::span<char* const> words);
+int StateCommand(std::span<char* const> words);
 int InfoCommand(std::span<char* const> words);
 int DumpCommand(std::span<char* const> words);

@@ -75,3 +75,10 @@ JsonWriter& JsonWriter::Bool(bool value)
     text += value ? "true" : "false";
     return *this;
 }
+
+JsonWriter& JsonWriter::Null()
+{
+    Separate();
+    text += "null";
+    return *this;
+}

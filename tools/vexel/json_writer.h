@@ -20,6 +20,7 @@ public:
     JsonWriter& Int(S64 value);
     JsonWriter& Number(double value);
     JsonWriter& Bool(bool value);
+    JsonWriter& Null();
 
     const std::string& Text() const { return text; }
 

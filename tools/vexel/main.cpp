@@ -8,8 +8,9 @@ namespace {
 
 constexpr char kHelp[] =
     "usage: vexel render MOVIE -o OUT [options]    pictures or sound of a movie\n"
+    "       vexel state MOVIE [options]            what the player holds at a picture\n"
     "       vexel info MOVIE [--json]              header, tags, labels, characters, sounds\n"
-    "       vexel dump MOVIE                       every tag, one a line\n"
+    "       vexel dump MOVIE                       every tag and action, one a line\n"
     "       vexel --help | --version\n"
     "\n"
     "MOVIE is a file, or - for standard input.\n"
@@ -24,10 +25,22 @@ constexpr char kHelp[] =
     "  --duration S                 the first S seconds\n"
     "                               (none of these: picture 1 as PNG, otherwise one pass of the\n"
     "                               main timeline)\n"
-    "  --size WxH                   pixels (default: the movie's own)\n"
     "  --quality low|high|best      (default: high)\n"
     "  --background COLOR           #RRGGBB or transparent (default: the movie's own)\n"
     "  --progress                   count the pictures on stderr\n"
+    "\n"
+    "state:\n"
+    "  --frame N                    at picture N (default: 1)\n"
+    "  --json                       one JSON object\n"
+    "\n"
+    "render and state:\n"
+    "  --size WxH                   pixels (default: the movie's own)\n"
+    "  --input EVENTS               a file with an event a line, done to the movie at picture N:\n"
+    "                               N move|down|up X Y, N key CODE [shift] [ctrl] [alt],\n"
+    "                               N text STRING\n"
+    "  --allow-net                  the movie may read from the network\n"
+    "  --allow-dir DIR              it may read files in DIR too\n"
+    "  --trace                      each action on stderr, as it is executed\n"
     "\n"
     "exit codes: 0 done, 1 failed while running, 2 wrong command line, 3 not a movie or\n"
     "unreadable, 5 stopped by a limit\n";
@@ -39,6 +52,7 @@ struct Command {
 
 constexpr Command kCommands[] = {
     {"render", RenderCommand},
+    {"state", StateCommand},
     {"info", InfoCommand},
     {"dump", DumpCommand},
 };

@@ -7,6 +7,7 @@
 #include <cstring>
 #include <fcntl.h>
 #include <memory>
+#include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
 #include <vector>
@@ -92,6 +93,12 @@ S64 MovieInput::Read(U8* buffer, size_t capacity)
     if (n == 0)
         ended = true;
     return n;
+}
+
+bool MovieInput::HasMore() const
+{
+    pollfd waiting = {fd, POLLIN, 0};
+    return !ended && poll(&waiting, 1, 0) > 0;
 }
 
 static std::string HeaderFault(const ScriptPlayer& movie)

@@ -26,6 +26,9 @@ public:
     // The next block as soon as there is one; 0 at the end, -1 after complaining about a failure.
     S64 Read(U8* buffer, size_t size);
 
+    // Read has something to say without waiting.
+    bool HasMore() const;
+
     const std::string& Name() const { return name; }
     bool Ended() const { return ended; }
     // Bytes of the whole input; -1 when that is known at its end only.

@@ -1,9 +1,6 @@
 // `vexel render`: pictures of a movie, each written as soon as its data is there, and its sound.
-#include "platform/headless/headless_sound.h"
-#include "platform/headless/native_player.h"
 #include "tools/vexel/commands.h"
-#include "tools/vexel/message.h"
-#include "tools/vexel/movie_input.h"
+#include "tools/vexel/movie_run.h"
 #include "tools/vexel/progress.h"
 #include "tools/vexel/render_options.h"
 
@@ -30,7 +27,7 @@ public:
     Renderer(const RenderOptions& renderOptions, MovieInput* movie,
              std::unique_ptr<PictureSink> pictureSink);
     // Plays for the sound alone, and leaves it to a second playing to say how the movie ends.
-    void Rehearse() { rehearsal = true; }
+    void Rehearse();
     // The sound that goes with the pictures, as a WAV file of the rehearsal.
     void AddSoundTrack(int descriptor) { soundTrack = descriptor; }
     // The exit code, after complaining when it is not 0.
@@ -45,9 +42,6 @@ private:
     void Listen();
     void SetSoundSpan();
     int PlayOut();
-    bool FeedBlock();
-    void FeedAll();
-    bool Reach(int picture);
     bool PassHolds(int picture);
     bool IsLast(int picture);
     int CheckArea();
@@ -59,10 +53,10 @@ private:
 
     const RenderOptions& options;
     MovieInput& input;
-    NativeSoundMix mixer; // outlives the player
-    NativePlayerWnd player;
-    int failure = kExitDone; // of the input
-    S32 framesOfWhole = -1;  // once all is there
+    MovieRun run;
+    NativePlayerWnd& player;
+    NativeSoundMix& mixer;
+    S32 framesOfWhole = -1; // once all is there
     std::unique_ptr<PictureSink> sink;
     int last = 0; // picture, unless there is to be one pass
     bool rehearsal = false;
@@ -73,13 +67,12 @@ private:
     bool soundWritten = true; // no failure so far
     bool heard = false;
     Progress progress;
-    U8 block[64 * 1024];
 };
 
 Renderer::Renderer(const RenderOptions& renderOptions, MovieInput* movie,
                    std::unique_ptr<PictureSink> pictureSink)
-    : options(renderOptions), input(*movie), player(renderOptions.width, renderOptions.height),
-      sink(std::move(pictureSink)),
+    : options(renderOptions), input(*movie), run(renderOptions, movie), player(run.player),
+      mixer(run.mixer), sink(std::move(pictureSink)),
       progress(renderOptions.progress,
                renderOptions.output.Numbered() || renderOptions.format->several)
 {
@@ -87,14 +80,21 @@ Renderer::Renderer(const RenderOptions& renderOptions, MovieInput* movie,
     player.SetScreenFormat(options.Screen());
     if (options.setBackground)
         player.OverrideBackground(options.background);
-    player.PlayThrough(&mixer);
 }
 
+void Renderer::Rehearse()
+{
+    rehearsal = true;
+    player.tracer = {};
+}
+
+// A pointer finds only what is there to be seen.
 void Renderer::Listen()
 {
     if (WantsPictures())
         return;
-    player.StopPainting();
+    if (options.input.All().empty())
+        player.StopPainting();
     mixer.Listen(TakeSound, this);
 }
 
@@ -131,55 +131,15 @@ int Renderer::PlayOut()
     return soundWritten ? kExitDone : FailWriting();
 }
 
-// False at the end of the input and on a failure.
-bool Renderer::FeedBlock()
-{
-    if (input.Ended() || failure != kExitDone)
-        return false;
-    const S64 n = input.Read(block, sizeof block);
-    if (n < 0) {
-        failure = kExitUnreadable;
-        return false;
-    }
-    if (n == 0)
-        player.EndOfData();
-    player.Feed(block, static_cast<size_t>(n));
-    failure = input.CheckMovie(player);
-    return failure == kExitDone;
-}
-
-void Renderer::FeedAll()
-{
-    while (FeedBlock()) {
-    }
-}
-
-// Brings the player from the picture before to this one, with as much data as that takes. A stream
-// reads ahead of the picture: what it finds must not depend on how the data arrives.
-bool Renderer::Reach(int picture)
-{
-    if (picture == 1) {
-        while (!player.Started() && FeedBlock()) {
-        }
-        return player.Started() && failure == kExitDone;
-    }
-    if (player.HasStream())
-        FeedAll();
-    while (!player.CanTick() && FeedBlock()) {
-    }
-    if (!player.CanTick() || failure != kExitDone)
-        return false;
-    player.Tick();
-    return soundWritten;
-}
-
 // One pass of the main timeline has that picture. Frames that are there are counted; how many a
-// header promises is not relied on.
+// header promises is not relied on. A movie that went before it was there has no more of them.
 bool Renderer::PassHolds(int picture)
 {
-    while (!player.Complete() && player.numFramesComplete < picture - 1 && FeedBlock()) {
+    while (!player.Complete() && player.numFramesComplete < picture - 1 && run.FeedBlock()) {
     }
-    if (!player.Complete())
+    if (framesOfWhole < 0 && run.Gone())
+        return false;
+    if (framesOfWhole < 0 && !player.Complete())
         return true;
     if (framesOfWhole < 0)
         framesOfWhole = player.CountFrames();
@@ -216,8 +176,8 @@ int Renderer::Begin()
         return code;
     last = options.LastFor(player.frameDelay);
     if (WantsSound())
-        FeedAll();
-    if (WantsSound() && options.wholePass && (failure != kExitDone || !player.Complete()))
+        run.FeedAll();
+    if (WantsSound() && options.wholePass && (run.Failure() != kExitDone || !player.Complete()))
         return Missing(0);
     if (WantsSound() && options.wholePass)
         last = std::max(player.CountFrames(), 1);
@@ -260,32 +220,21 @@ int Renderer::Finish()
     progress.End();
     if (rehearsal)
         return kExitDone;
-    if (input.Size() >= 0 && input.Size() < player.scriptLen)
-        FeedAll();
-    if (input.Ended() && !player.Complete())
-        input.ComplainTruncated(player);
+    run.ComplainTruncated();
     return kExitDone;
 }
 
 int Renderer::Missing(int picture)
 {
     progress.End();
-    if (!soundWritten)
-        return FailWriting();
-    if (failure != kExitDone)
-        return failure;
-    if (!player.Complete())
-        input.ComplainTruncated(player);
-    else
-        Complain(input.Name(), Format("there is no picture %d", picture));
-    return kExitFailed;
+    return soundWritten ? run.Missing(picture) : FailWriting();
 }
 
 int Renderer::Run()
 {
     Listen();
     for (int picture = 1;; picture++) {
-        if (!Reach(picture))
+        if (!run.Reach(picture) || !soundWritten)
             return Missing(picture);
         int code = picture == 1 ? Begin() : kExitDone;
         if (code == kExitDone && picture >= options.first)
@@ -362,6 +311,9 @@ int RenderCommand(std::span<char* const> words)
     RenderOptions options;
     if (!options.Parse(words))
         return kExitUsage;
+    const int code = options.Prepare();
+    if (code != kExitDone)
+        return code;
     // A reader of our output that goes away shows as a failed write.
     std::signal(SIGPIPE, SIG_IGN);
     try {

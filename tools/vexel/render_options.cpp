@@ -1,26 +1,15 @@
 #include "tools/vexel/render_options.h"
 
-#include "core/raster/bit_buffer.h"
-#include "tools/vexel/arguments.h"
 #include "tools/vexel/message.h"
 
 namespace {
 
 constexpr OptionForm kOptions[] = {
-    {"-o", true},        {"--format", true},     {"--frame", true},
-    {"--frames", true},  {"--duration", true},   {"--size", true},
-    {"--quality", true}, {"--background", true}, {"--progress", false},
+    {"-o", true},         {"--format", true},  {"--frame", true},      {"--frames", true},
+    {"--duration", true}, {"--quality", true}, {"--background", true}, {"--progress", false},
+    PlayOptions::kSize,   PlayOptions::kInput, PlayOptions::kAllowNet, PlayOptions::kAllowDir,
+    PlayOptions::kTrace,
 };
-
-constexpr int kLastPicture = 0x7FFFFFFE;
-
-// Two numbers with a mark between them.
-bool ParsePair(const std::string& text, char mark, int high, int* a, int* b)
-{
-    const size_t at = text.find(mark);
-    return at != std::string::npos && ParseNumber(text.substr(0, at), 1, high, a) &&
-           ParseNumber(text.substr(at + 1), 1, high, b);
-}
 
 // Seconds with up to three decimals, as milliseconds.
 bool ParseSeconds(const std::string& text, int* milliseconds)
@@ -107,10 +96,6 @@ std::string ParseValues(const Arguments& args, RenderOptions* options)
 {
     if (!ParseFrames(args, options))
         return "pictures are chosen by --frame N or --frames A-B, counted from 1, or --duration S";
-    const std::string* size = args.Find("--size");
-    if (size != nullptr &&
-        !ParsePair(*size, 'x', CBitBuffer::kMaxSide, &options->width, &options->height))
-        return Format("--size takes WxH, each from 1 to %d", CBitBuffer::kMaxSide);
     const std::string* quality = args.Find("--quality");
     if (quality != nullptr && !ParseQuality(*quality, &options->quality))
         return "--quality takes low, high or best";
@@ -119,7 +104,7 @@ std::string ParseValues(const Arguments& args, RenderOptions* options)
     if (background != nullptr && !ParseColor(*background, &options->background))
         return "--background takes #RRGGBB or transparent";
     options->progress = args.Has("--progress");
-    return "";
+    return options->ParsePlay(args);
 }
 
 // By the word for it, by the name's extension, or PNG on standard output.
@@ -180,7 +165,6 @@ bool RenderOptions::Parse(std::span<char* const> words)
         ComplainUsage(fault);
         return false;
     }
-    movie = args.Rest()[0];
     return true;
 }
 

@@ -4,21 +4,19 @@
 #include "core/raster/color.h"
 #include "tools/vexel/output_file.h"
 #include "tools/vexel/output_format.h"
+#include "tools/vexel/play_options.h"
 
 #include <span>
 #include <string>
 
-struct RenderOptions {
-    std::string movie;
+struct RenderOptions : PlayOptions {
     OutputName output;
     const OutputFormat* format = nullptr;
     bool wholePass = false; // one pass of the main timeline, whatever first and last say
     int first = 1;          // pictures count from 1
     int last = 1;
     int duration = 0; // milliseconds; 0: `last` holds
-    int width = 0;    // pixels; 0 x 0 is the movie's own size
-    int height = 0;
-    int quality = 1; // 0 low, 1 high, 2 best
+    int quality = 1;  // 0 low, 1 high, 2 best
     bool setBackground = false;
     SRGB background; // alpha 0: transparent
     bool progress = false;
