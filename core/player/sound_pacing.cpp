@@ -56,4 +56,6 @@ void SPlayer::SilenceThreads()
 {
     for (ScriptThread* thread = scene.threads; thread; thread = thread->nextThread)
         thread->Silence();
+    if (scene.soundMix)
+        scene.soundMix->RemoveTagged(scene.soundTag);
 }

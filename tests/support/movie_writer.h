@@ -18,6 +18,18 @@ struct PlaceOptions {
     std::optional<U16> clipDepth = {};
 };
 
+// An image of a button: when it shows, and whether it is part of the hit area (1 up, 2 over, 4
+// down, 8 hit). Its colour is written by the second form of button only.
+struct ButtonImage {
+    U32 flags;
+    U16 id, layer;
+    Mat mat = {};
+    Cx cx = {};
+};
+
+// Blocks of actions and what they are for: a bit for each transition, from bit 9 on a key code.
+using ButtonBlocks = std::vector<std::pair<U32, std::vector<U8>>>;
+
 // Grows a sequence of tags: a sprite's timeline, or (as MovieWriter) a whole movie's. Nothing is
 // checked, so that tests can write broken movies too.
 class TagWriter {
@@ -36,6 +48,9 @@ public:
     {
         return DefineSprite(id, U16(nested.Frames()), nested);
     }
+    // Code 7 has one block, whatever it is for; 34 has them all.
+    TagWriter& DefineButton(U16 id, int code, const std::vector<ButtonImage>& images,
+                            const ButtonBlocks& blocks = {}, bool menu = false);
     TagWriter& FreeCharacter(U16 id) { return Raw(kTagFreeCharacter, Numbers(id)); }
 
     // Code 4.
