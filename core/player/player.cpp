@@ -36,9 +36,9 @@ SPlayer::SPlayer()
 SPlayer::~SPlayer()
 {
     running = 0;
-    stream = nullptr;
-    for (ScriptPlayer* movie = layers; movie != nullptr; movie = movie->nextLayer)
-        movie->stream = nullptr;
+    for (ScriptThread* thread = scene.threads; thread != nullptr; thread = thread->nextThread)
+        if (thread->IsRoot())
+            thread->player->stream = nullptr;
     FreeLayers();
     for (ScriptPlayer* loader = loaders; loader != nullptr; loader = loader->nextLayer)
         loader->stream = nullptr;

@@ -109,7 +109,7 @@ void HttpClient::Start(HttpTransfer* transfer)
     transfer->status = 0;
     transfer->done = false;
     transfer->location.clear();
-    if (multi == nullptr)
+    if (multi == nullptr && curl_global_init(CURL_GLOBAL_DEFAULT) == CURLE_OK)
         multi = curl_multi_init();
     transfer->handle = multi != nullptr ? curl_easy_init() : nullptr;
     if (transfer->handle != nullptr)
