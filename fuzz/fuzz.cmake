@@ -2,7 +2,7 @@
 # becomes a program that replays inputs, which ./check runs over the kept corpus.
 option(VEXEL_LIBFUZZER "Link the fuzz entries with libFuzzer (clang)" OFF)
 
-foreach(entry movie shape image sound)
+foreach(entry movie shape image sound actions)
   if(EXISTS ${CMAKE_SOURCE_DIR}/fuzz/${entry}.cpp)
     add_executable(replay_${entry} fuzz/${entry}.cpp fuzz/replay_main.cpp)
     target_link_libraries(replay_${entry} PRIVATE vexel_headless vexel_support)
