@@ -48,17 +48,17 @@ SActionBlock& ActionRunner::RunningBlock() const
     return list->At(list->Head());
 }
 
-// A target chosen before a call is still chosen after it, unless the caller's timeline went.
+// A target chosen before a call is still chosen after it. A caller whose timeline went is passed
+// over, like every other block of it.
 void ActionRunner::NextBlock()
 {
     SCallLevel& level = calls.levels[calls.level];
     const SActionBlock block = RunningBlock();
-    const bool goesOn = resuming && block.actions;
-    resuming = false;
-    if (!goesOn) {
+    if (!resuming) {
         level.target = nullptr;
         level.targetSet = false;
     }
+    resuming = false;
     if (block.actions)
         RunBlock(block);
     else
