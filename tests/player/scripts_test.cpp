@@ -1,101 +1,26 @@
 // Runs the programs in tests/data/scripts. README.txt there says how they are written.
 #include "core/player/limits.h"
-#include "core/player/opcodes.h"
 #include "tests/player/player_scene.h"
+#include "tests/support/script_writer.h"
 
-#include <bit>
 #include <fstream>
 #include <map>
-#include <regex>
 
 namespace {
 
 constexpr int kRootFrames = 6;
 
-struct Token {
-    char kind; // " text, < bytes in hexadecimal, or a word
-    std::string text;
-};
-using Tokens = std::vector<Token>;
-
-Tokens Split(const std::string& line)
-{
-    static const std::regex kToken(R"("([^"]*)\"|<([^>]*)>|#.*|\S+)"), kByte(R"(\\x(..))");
-    Tokens tokens;
-    for (std::sregex_iterator it(line.begin(), line.end(), kToken), end; it != end; ++it) {
-        const char kind = it->str()[0];
-        std::string text = kind == '"' ? it->str(1) : it->str();
-        if (kind == '<')
-            text = std::regex_replace(it->str(2), std::regex("(..) *"), "\\x$1");
-        for (std::smatch byte; std::regex_search(text, byte, kByte);)
-            text.replace(size_t(byte.position()), 4, 1, char(std::stoi(byte[1], nullptr, 16)));
-        if (kind != '#')
-            tokens.push_back({kind, text});
-    }
-    return tokens;
-}
-
-// The operands of records with a payload: w word, b byte, s string, j jump.
-const std::map<std::string, std::string> kOperands = {
-    {"GotoFrame", "w"},  {"GetURL", "ss"},      {"WaitForFrame", "wb"}, {"WaitForFrameExpr", "b"},
-    {"Jump", "j"},       {"If", "j"},           {"SetTarget", "s"},     {"GotoLabel", "s"},
-    {"GetURLExpr", "b"}, {"GotoFrameExpr", "b"}};
-
-// The first pass finds the labels.
-std::vector<U8> Assemble(const Tokens& tokens)
-{
-    std::map<std::string, size_t> labels;
-    ByteWriter code;
-    for (int pass = 0; pass < 2; pass++) {
-        code = {};
-        for (auto token = tokens.begin(); token != tokens.end(); ++token) {
-            const std::string text = token->text;
-            ByteWriter payload;
-            int op = kOpPush;
-            if (token->kind == '<') {
-                code.PutBytes({text.begin(), text.end()});
-                continue;
-            } else if (token->kind == '"') {
-                payload.PutU8(0).PutString(text);
-            } else if (text.back() == ':') {
-                labels[text] = code.Size();
-                continue;
-            } else if (isdigit(text[0]) || text[0] == '-') {
-                payload.PutU8(1).PutU32(std::bit_cast<U32>(std::stof(text)));
-            } else {
-                for (op = 0xFF; op >= 0 && (!OpcodeName(U8(op)) || text != OpcodeName(U8(op)));)
-                    op--;
-                EXPECT_GE(op, 0) << "no record is called " << text;
-                for (char kind : kOperands.count(text) ? kOperands.at(text) : "") {
-                    const std::string& word = (++token)->text;
-                    const bool label = kind == 'j' && isalpha(word[0]);
-                    const S32 number = kind == 's' ? 0
-                                       : label     ? S32(labels[word + ":"]) - S32(code.Size()) - 5
-                                                   : std::stoi(word, nullptr, 0);
-                    kind == 's'   ? payload.PutString(word)
-                    : kind == 'b' ? payload.PutU8(U32(number))
-                                  : payload.PutU16(U32(number));
-                }
-            }
-            code.PutU8(U32(op));
-            if (op >= kFirstOpWithPayload)
-                code.PutU16(U32(payload.Size())).PutBytes(payload.Bytes());
-        }
-    }
-    return code.Bytes();
-}
-
 struct Script {
     std::string where;
-    std::map<std::string, Tokens> code = {}; // by timeline and frame, from 1
+    std::map<std::string, ScriptWords> code = {}; // by timeline and frame, from 1
     int framesLoaded = kRootFrames;
     int level = 0; // one that plays the code for "level"
-    std::vector<Tokens> wanted = {};
+    std::vector<ScriptWords> wanted = {};
 
     TagWriter& Write(TagWriter* tags, const std::string& place, int frame) const
     {
         const auto block = code.find(place + " " + std::to_string(frame));
-        return block != code.end() ? tags->DoAction(Assemble(block->second)) : *tags;
+        return block != code.end() ? tags->DoAction(AssembleScript(block->second)) : *tags;
     }
 };
 
@@ -150,7 +75,7 @@ std::string Answer(ScriptShell* player, const std::string& what, const std::stri
     return std::to_string(numbers.at(what));
 }
 
-void Check(ScriptShell* player, const Tokens& want)
+void Check(ScriptShell* player, const ScriptWords& want)
 {
     const bool stack = want[0].text == "stack";
     ASSERT_TRUE(!stack || player->stack.Count() == want.size() - 1) << player->stack.Count();
@@ -183,12 +108,12 @@ void Play(const Script& script, bool traced)
         player.DoActions();
     }
     EXPECT_EQ(player.scene.calls.level, 0);
-    for (const Tokens& want : script.wanted)
+    for (const ScriptWords& want : script.wanted)
         Check(&player, want);
     player.DoPlay(0); // and on it goes
 }
 
-void Append(Tokens* to, const Tokens& more)
+void Append(ScriptWords* to, const ScriptWords& more)
 {
     to->insert(to->end(), more.begin(), more.end());
 }
@@ -199,7 +124,7 @@ std::vector<Script> Read(const std::string& file)
     std::string place, line;
     std::ifstream in(file);
     for (int n = 1; std::getline(in, line); n++) {
-        const Tokens tokens = Split(line);
+        const ScriptWords tokens = SplitScript(line);
         const std::string verb = tokens.empty() ? "test" : tokens[0].text;
         const size_t arrow = verb == "=" ? std::string::npos : line.find(" ->");
         if ((verb == "test" && !tokens.empty()) || arrow != std::string::npos) {
@@ -207,8 +132,8 @@ std::vector<Script> Read(const std::string& file)
             place = "root 1";
         }
         if (arrow != std::string::npos) {
-            Append(&scripts.back().code[place], Split(line.substr(0, arrow)));
-            scripts.back().wanted.push_back(Split("stack " + line.substr(arrow + 3)));
+            Append(&scripts.back().code[place], SplitScript(line.substr(0, arrow)));
+            scripts.back().wanted.push_back(SplitScript("stack " + line.substr(arrow + 3)));
         } else if (verb == "on") {
             place = tokens.at(1).text + " " + tokens.at(2).text;
         } else if (verb == "loaded" || verb == "level") {
