@@ -130,7 +130,7 @@ TEST(Buttons, HitAreas)
                 s.Place(depth, id, AtPixel(place / 10 * 20, place % 10 * 20), clip);
             s.Shown();
             std::string hits;
-            const SPOINT far = {0x40000005, 0x40000002};
+            const SPOINT far = {0x4000001E, 0x4000000A};
             for (int at = 0; at < 9; at++) {
                 const SPOINT pt = {at % 3 * 20 + 10, at / 3 * 20 + 10};
                 const SObject* hit = s.list.HitButton(&pt);
