@@ -84,3 +84,11 @@ void ActionList::Clear()
         PopFront();
     head = tail = 0;
 }
+
+void SCallTable::FreeLists(int from)
+{
+    for (int i = from; i <= kMaxLevels && levels[i].list; i++) {
+        delete levels[i].list;
+        levels[i].list = nullptr;
+    }
+}

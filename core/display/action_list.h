@@ -55,7 +55,7 @@ private:
 // A level of calls: level 1 drains the display list's own queue, each deeper one a list that a call
 // has built.
 struct SCallLevel {
-    ActionList* list;     // owned from level 2 on
+    ActionList* list;     // owned from level 2 on, where it may wait empty for the next call
     ScriptThread* target; // chosen by the running block; may be null though targetSet
     bool targetSet;       // records act on `target` instead of the block's timeline
 };
@@ -66,4 +66,11 @@ struct SCallTable {
 
     int level = 0;
     SCallLevel levels[kMaxLevels + 1] = {}; // from 1
+
+    SCallTable() = default;
+    ~SCallTable() { FreeLists(2); }
+    SCallTable(const SCallTable&) = delete;
+    SCallTable& operator=(const SCallTable&) = delete;
+    // The lists of that level, 2 or above, and all deeper ones.
+    void FreeLists(int from);
 };

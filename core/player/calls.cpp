@@ -6,6 +6,8 @@
 
 namespace {
 
+constexpr int kKeptLevels = 8;
+
 U32 SkipFrames(STagWalker* walker, S32 len, S32 frames)
 {
     U32 seen = 0;
@@ -51,28 +53,29 @@ void ActionRunner::Call(ScriptThread* thread, const U8* resumeAt)
     ScriptThread* target = PopFrameSpec(thread, &frame);
     if (!target || calls.level >= SCallTable::kMaxLevels)
         return;
-    auto* list = new (std::nothrow) ActionList;
+    ActionList*& list = calls.levels[calls.level + 1].list;
+    if (!list)
+        list = new (std::nothrow) ActionList;
     if (!list)
         return;
     player->scriptWork += QueueFrameActions(target, frame, list);
     if (RunningBlock().actions)
         RunningBlock().actions = resumeAt;
     calls.level++;
-    calls.levels[calls.level] = {list, nullptr, false};
 }
 
+// The lists of the first levels stay for the next calls.
 void ActionRunner::DropLevel()
 {
-    if (calls.level > 1)
-        delete calls.levels[calls.level].list;
-    calls.levels[calls.level] = {};
+    calls.levels[calls.level].list->Clear();
+    if (calls.level > kKeptLevels)
+        calls.FreeLists(calls.level);
     calls.level--;
     resuming = true;
 }
 
 void EndCalls(SCallTable* calls)
 {
-    for (; calls->level > 1; calls->level--)
-        delete calls->levels[calls->level].list;
+    calls->FreeLists(2);
     calls->level = 0;
 }
