@@ -25,10 +25,10 @@ protected:
         root = fs::canonical(mkdtemp(name));
         home = root / "home";
         fs::create_directories(home / "sub");
-        Write(root / "secret", {'x', '=', 's'});
+        Write(root / "homework", {'x', '=', 's'});
         Write(home / "v t.txt", {'x', '=', '1'});
         Write(home / "sub/m.vxm", MovingSquare(3));
-        fs::create_symlink("../secret", home / "out");
+        fs::create_symlink("../homework", home / "out");
         fs::create_symlink("sub/m.vxm", home / "in.vxm");
         mkfifo((home / "pipe").c_str(), 0600);
         const std::vector<U8> movie = MovingSquare(9);
@@ -85,15 +85,13 @@ struct Server {
             do
                 last.append(block, size_t(recv(fd, block, sizeof block, 0)));
             while (!last.ends_with(last[0] == 'P' ? "%20" : "\r\n\r\n"));
-            const size_t path = last.find('/') + 1;
-            const std::string answer =
-                "HTTP/1.0 " + answers[last.substr(path, last.find(' ', path) - path)];
+            const std::string answer = "HTTP/1.0 " + answers[last.substr(0, last.find(" HTTP"))];
             send(fd, answer.data(), answer.size(), MSG_NOSIGNAL);
         }
     }
 
     std::string base, last;                     // URL; request
-    std::map<std::string, std::string> answers; // by path: all that is sent
+    std::map<std::string, std::string> answers; // by method and path: all that is sent
     int listener = socket(AF_INET, SOCK_STREAM, 0);
     std::thread thread;
 };
@@ -101,7 +99,7 @@ struct Server {
 TEST_F(Loading, OnlyWhatLiesAroundTheMovie)
 {
     std::istringstream cases(
-        "v%20t.txt 1 ./sub/../v%20t.txt?q#f 1 ../secret -folder ..%2fsecret -folder "
+        "v%20t.txt 1 ./sub/../v%20t.txt?q#f 1 ../homework -folder ..%2fhomework -folder "
         "/etc/passwd -folder out -folder sub -file pipe -file none -file "
         "v%00t.txt -path //host/v -machine http://127.0.0.1/ -allowed data:x=1 -web");
     for (std::string url, result; cases >> url >> result;)
@@ -111,7 +109,7 @@ TEST_F(Loading, OnlyWhatLiesAroundTheMovie)
     gLimits.movieBytes = 2;
     EXPECT_EQ("-large", Ask("v t.txt"));
     gLimits = {};
-    EXPECT_TRUE(player.AllowDir(root) && !player.AllowDir(root / "secret") && Ask("out") == "s");
+    EXPECT_TRUE(player.AllowDir(root) && !player.AllowDir(root / "homework") && Ask("out") == "s");
     AccessPolicy web;
     web.SetOrigin("http://h/m.vxm");
     EXPECT_EQ(nullptr, web.Check("http://H:80/x").refusal);
@@ -175,16 +173,19 @@ TEST_F(Loading, FromTheWebWhenAllowed)
         GTEST_SKIP();
     const std::vector<U8> movie = MovingSquare(3);
     Server server;
-    server.answers["a/m"] = "200 OK\r\n\r\n" + std::string(movie.begin(), movie.end());
-    server.answers["a/v"] = "200 OK\r\nContent-Length: 3\r\n\r\nx=3";
-    server.answers["moved"] = "302 Found\r\nLocation: a/v\r\n\r\nx=no";
-    server.answers["file"] = "302 Found\r\nLocation: file://" + home.string() + "/v t.txt\r\n\r\n";
-    server.answers["loop"] = "302 Found\r\nLocation: loop\r\n\r\n";
-    server.answers["none"] = "404 None\r\n\r\nx=no";
+    server.answers["GET /a/m"] = "200 OK\r\n\r\n" + std::string(movie.begin(), movie.end());
+    server.answers["GET /a/v"] = "200 OK\r\nContent-Length: 3\r\n\r\nx=3";
+    server.answers["POST /a/v"] = "200 OK\r\nContent-Length: 3\r\n\r\nx=5";
+    server.answers["POST /moved"] = "302 F\r\nLocation: a/v\r\n\r\nx=no";
+    server.answers["POST /file"] =
+        "302 F\r\nLocation: file://" + home.string() + "/v t.txt\r\n\r\n";
+    server.answers["GET /a/loop"] = server.answers["POST /loop"] =
+        "302 F\r\nLocation: /a/loop\r\n\r\n";
+    server.answers["POST /none"] = "404 None\r\n\r\nx=no";
     EXPECT_EQ("-allowed", Ask(server.base + "a/v") + server.last);
     player.AllowNet();
     EXPECT_EQ("1", Ask("v t.txt"));
-    std::istringstream cases("moved 3 file -file loop -another none -404 a/v 3");
+    std::istringstream cases("moved 3 file -file loop -another none -404 a/v 5");
     for (std::string path, result; cases >> path >> result;)
         EXPECT_EQ(result, Ask(server.base + path, "a=b+c&d=%20"));
     const std::string sent = server.last.substr(server.last.find("Accept"));
