@@ -172,15 +172,14 @@ TEST_F(Loading, FromTheWebWhenAllowed)
     if (!HttpClient::Supported())
         GTEST_SKIP();
     const std::vector<U8> movie = MovingSquare(3);
+    const std::string moved = "302 Found\r\nLocation: ";
     Server server;
     server.answers["GET /a/m"] = "200 OK\r\n\r\n" + std::string(movie.begin(), movie.end());
     server.answers["GET /a/v"] = "200 OK\r\nContent-Length: 3\r\n\r\nx=3";
     server.answers["POST /a/v"] = "200 OK\r\nContent-Length: 3\r\n\r\nx=5";
-    server.answers["POST /moved"] = "302 F\r\nLocation: a/v\r\n\r\nx=no";
-    server.answers["POST /file"] =
-        "302 F\r\nLocation: file://" + home.string() + "/v t.txt\r\n\r\n";
-    server.answers["GET /a/loop"] = server.answers["POST /loop"] =
-        "302 F\r\nLocation: /a/loop\r\n\r\n";
+    server.answers["POST /moved"] = moved + "a/v\r\n\r\nx=no";
+    server.answers["POST /file"] = moved + "file://" + home.string() + "/v t.txt\r\n\r\n";
+    server.answers["GET /a/loop"] = server.answers["POST /loop"] = moved + "/a/loop\r\n\r\n";
     server.answers["POST /none"] = "404 None\r\n\r\nx=no";
     EXPECT_EQ("-allowed", Ask(server.base + "a/v") + server.last);
     player.AllowNet();
