@@ -17,4 +17,7 @@ if(benchmark_FOUND)
   add_executable(vexel_sound_bench bench/sound_bench.cpp)
   target_link_libraries(vexel_sound_bench PRIVATE vexel_headless benchmark::benchmark)
   target_compile_definitions(vexel_sound_bench PRIVATE VEXEL_SOURCE_DIR="${CMAKE_SOURCE_DIR}")
+  add_executable(vexel_script_bench bench/script_bench.cpp)
+  target_link_libraries(vexel_script_bench PRIVATE vexel_headless vexel_support
+    benchmark::benchmark)
 endif()
