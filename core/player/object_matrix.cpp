@@ -10,7 +10,6 @@ namespace {
 constexpr int kUnitBits = 30; // fraction bits of directions
 constexpr S64 kUnitHalf = S64{1} << (kUnitBits - 1);
 constexpr S32 kLeastChange = 16;
-constexpr double kRoundingError = 1e-6;
 
 // A direction as a vector of length 1; two zeros for none.
 struct Direction {
@@ -77,11 +76,6 @@ SPOINT Turned(SPOINT column, Direction turn)
 
 } // namespace
 
-S32 WholeUnits(double value)
-{
-    return TruncateToInt(value < 0 ? value - kRoundingError : value + kRoundingError);
-}
-
 double MatrixScalePercent(const MATRIX* m, SAxis axis)
 {
     const SPOINT column = Column(m, axis);
@@ -91,7 +85,7 @@ double MatrixScalePercent(const MATRIX* m, SAxis axis)
 void MatrixSetScalePercent(MATRIX* m, SAxis axis, double percent)
 {
     const SPOINT column = Column(m, axis);
-    const S32 length = WholeUnits(percent / 100.0 * 65536.0);
+    const S32 length = TruncateToInt(percent / 100.0 * 65536.0);
     if (IsWithin(length, PointLength(&column), kLeastChange))
         return;
     const Direction dir = ColumnDirection(m, axis);

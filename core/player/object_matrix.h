@@ -18,7 +18,3 @@ void MatrixSetScalePercent(MATRIX* m, SAxis axis, double percent);
 double MatrixRotation(const MATRIX* m);
 // Turns both columns so that the first gets the direction; lengths and the angle between them stay.
 void MatrixSetRotation(MATRIX* m, double degrees);
-
-// A number of units as scripts compute them, cut toward zero and kept to 32 bits. What falls short
-// of a whole number only because a fraction was rounded counts as that number.
-S32 WholeUnits(double value);

@@ -57,7 +57,7 @@ S32 FramesLoaded(const ScriptThread* thread)
 
 void SetAlpha(ColorTransform* cxform, double percent)
 {
-    cxform->alphaMul = static_cast<S16>(std::clamp(WholeUnits(percent * 2.56), -0x8000, 0x7FFF));
+    cxform->alphaMul = static_cast<S16>(std::clamp(TruncateToInt(percent * 2.56), -0x8000, 0x7FFF));
     cxform->CalcFlags();
 }
 
@@ -131,10 +131,10 @@ void SPlayer::SetObjectProperty(SObject* obj, int index, double value)
         obj->puppet = 1;
     switch (index) {
     case kPropX:
-        mat->tx = WholeUnits(value * kTwips);
+        mat->tx = TruncateToInt(value * kTwips);
         break;
     case kPropY:
-        mat->ty = WholeUnits(value * kTwips);
+        mat->ty = TruncateToInt(value * kTwips);
         break;
     case kPropXScale:
         MatrixSetScalePercent(mat, kAxisX, value);

@@ -67,6 +67,7 @@ struct Theatre : PlayingShell {
     std::string Drag(S32 x, S32 y, const char* path)
     {
         const SPOINT pt = {x, y};
+        RectSetEmpty(&invalidated);
         UpdateDragObject(&pt);
         const MATRIX& m = Object(path)->xform.mat;
         const S32 rough[] = {FixedNearestMultiple(m.tx, 10), FixedNearestMultiple(m.ty, 10)};
@@ -89,13 +90,15 @@ TEST(Names, LeadToTimelinesAndVariables)
     SObject* button = t.scene.FindChild(t.rootObject, 4);
     for (SObject* obj : {button, button->bottomChild, t.scene.FindChild(t.Object("/a"), 9)})
         EXPECT_EQ(obj->depth == 9 ? "/a" : "/", Taken(t.GetTargetPath(obj)));
+    t.ScriptThread::SetVariable("x.y", "1", 0); // by other means than its path
     for (const auto& row : Rows(3, R"(
         /a x /a:x   /a b:x /a/b:X   /a :y /a:y   /a/b /:z Z   /a _level6:v _vexel6:V
-        /a a/b /a:a/b   /a f.scroll none   /a /:f.x none   /a nobody:x none)")) {
+        /a a/b /a:a/b   _level6 :w _level6:W   / f.scroll none   / /:x.y none   /a nobody:x none)")) {
         ScriptValue value;
         t.SetVariable(t.At(row[0]), row[1].c_str(), row[1].c_str(), 1);
         EXPECT_EQ(row[2] != "none", t.GetVariable(t.At(row[0]), row[1].c_str(), &value)) << row[1];
         EXPECT_EQ(value.Text(), Taken(t.GetVariable(nullptr, row[2].c_str())));
+        EXPECT_EQ(nullptr, t.FindVariable("f.scroll"));
     }
     // Paths of half a megabyte end, and what they cost is told.
     std::string far;
@@ -138,9 +141,8 @@ TEST(Properties, AreReadAndWritten)
         2 100.02 1,0,0,1 1,0,0,1    2 100.03 1,0,0,1 1.0003,0,0,1   3 50 1,0,-.8,.6 1,0,-.4,.3
         2 100 0,0,-1,0 0,1,-1,0     2 500 46e-6,61e-6,0,1 3,4,0,1   3 100 0,1,0,0 0,1,-1,0
         2 100 0,0,0,0 1,0,0,0       3 100 0,0,0,0 0,0,0,1       3 -50 2,0,1,1 2,0,-.35355,-.35355
-        10 0 1,0,1,1 1,0,1,1        10 0 0,1,2,1 1,0,1,-2       10 90 1,0,0,1 0,1,-1,0
-        10 90 1,0,0,-1 0,1,1,0      10 180 0,0,0,1 0,0,0,-1     10 -450 1,0,0,1 0,-1,1,0
-        10 45 1,0,0,1 .70711,.70711,-.70711,.70711)")) {
+        10 0 1,0,1,1 1,0,1,1        10 0 0,1,2,1 1,0,1,-2       10 90 1,0,0,-1 0,1,1,0
+        10 180 0,0,0,1 0,0,0,-1   10 -450 1,0,0,1 0,-1,1,0   10 45 1,0,0,1 .7071,.7071,-.7071,.7071)")) {
         MATRIX m[2];
         for (int k = 0; k < 2; k++) {
             double f[4];
@@ -148,8 +150,7 @@ TEST(Properties, AreReadAndWritten)
             m[k] = {Mat::Fixed(f[0]), Mat::Fixed(f[1]), Mat::Fixed(f[2]), Mat::Fixed(f[3]), 7, 8};
         }
         obj->xform.mat = m[0];
-        obj->puppet = 0;
-        t.scene.CalcUpdate();
+        obj->puppet = obj->dirty = 0;
         t.SetProperty(t.At("/a"), std::stoi(row[0]), std::stod(row[1]));
         EXPECT_TRUE(MatrixEqual(&m[1], &obj->xform.mat, 3) && obj->puppet && obj->dirty)
             << row[0] << " = " << row[1];
@@ -166,16 +167,15 @@ TEST(Properties, AreReadAndWritten)
 TEST(Drag, FollowsThePointerInItsParent)
 {
     Theatre t;
-    const SRECT swapped = {500, 440, 60, 40};
+    const SRECT swapped = {450, 390, 60, -10};
     t.Object("_level5")->visible = 0;
-    t.mousePt = {50, 30};
+    t.mousePt = {45, 35};
     t.StartDrag(t.At("/a/b"), false, nullptr);
-    EXPECT_EQ("100 -100 ", t.Drag(60, 40, "/a/b"));
-    EXPECT_EQ("450 50 /a/c", t.Drag(45, 75, "/a/b"));
+    EXPECT_EQ("100 -100 ", t.Drag(55, 45, "/a/b"));
+    EXPECT_EQ("400 0 /a/c", t.Drag(45, 75, "/a/b"));
     t.StartDrag(t.At("/a/b"), false, &swapped);
-    EXPECT_EQ("500 40 ", t.Drag(100, 160, "/a/b"));
-    EXPECT_EQ("440 60 /", t.Drag(5, 5, "/a/b"));
-    EXPECT_EQ("450 50 /a/c", t.Drag(45, 75, "/a/b")) << "held where it was";
+    EXPECT_EQ("450 -10 ", t.Drag(100, 160, "/a/b"));
+    EXPECT_EQ("400 0 /a/c", t.Drag(45, 75, "/a/b")) << "held where it was";
     t.mousePt = {5, 5};
     t.EndDrag();
     t.mousePt = {45, 75};
