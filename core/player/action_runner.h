@@ -66,10 +66,10 @@ private:
     // --- timelines and objects (action_targets.cpp) ---
     void SeekTo(ScriptThread* thread, S64 frame);
     void SeekLabel(ScriptThread* thread, const SActionRecord& record);
-    void SeekSpec(ScriptThread* thread, bool play);
+    void SeekNamed(ScriptThread* thread, bool play);
     int RecordsToSkip(ScriptThread* thread, S32 frame, U8 count) const;
-    int RecordsToSkipSpec(ScriptThread* thread, U8 count);
-    ScriptThread* PopFrameSpec(ScriptThread* thread, S32* frame);
+    int RecordsToSkipNamed(ScriptThread* thread, U8 count);
+    ScriptThread* PopFrame(ScriptThread* thread, S32* frame);
     void SetTarget(const char* path);
     void SetTargetText(const SActionRecord& record);
     ScriptThread* PopTarget(ScriptThread* thread);

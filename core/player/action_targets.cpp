@@ -61,17 +61,17 @@ void ActionRunner::SeekLabel(ScriptThread* thread, const SActionRecord& record)
         thread->Seek(frame);
 }
 
-ScriptThread* ActionRunner::PopFrameSpec(ScriptThread* thread, S32* frame)
+ScriptThread* ActionRunner::PopFrame(ScriptThread* thread, S32* frame)
 {
-    ScriptValue spec = stack.Pop();
+    ScriptValue name = stack.Pop();
     TagCharge charge(player);
-    return player->ResolveFrameNum(spec.Text(), thread, frame);
+    return player->ResolveFrameNum(name.Text(), thread, frame);
 }
 
-void ActionRunner::SeekSpec(ScriptThread* thread, bool play)
+void ActionRunner::SeekNamed(ScriptThread* thread, bool play)
 {
     S32 frame = 0;
-    ScriptThread* target = PopFrameSpec(thread, &frame);
+    ScriptThread* target = PopFrame(thread, &frame);
     if (!target)
         return;
     SeekTo(target, frame);
@@ -84,10 +84,10 @@ int ActionRunner::RecordsToSkip(ScriptThread* thread, S32 frame, U8 count) const
     return thread && thread->player && !thread->player->FrameAvailable(frame) ? count : 0;
 }
 
-int ActionRunner::RecordsToSkipSpec(ScriptThread* thread, U8 count)
+int ActionRunner::RecordsToSkipNamed(ScriptThread* thread, U8 count)
 {
     S32 frame = 0;
-    ScriptThread* target = PopFrameSpec(thread, &frame);
+    ScriptThread* target = PopFrame(thread, &frame);
     return RecordsToSkip(target, frame, count);
 }
 

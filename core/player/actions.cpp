@@ -269,13 +269,13 @@ template <bool kTraced> void ActionRunner::RunRecords(const SActionBlock& block)
             SeekLabel(thread, record);
             break;
         case kOpGotoFrameExpr:
-            SeekSpec(thread, record.Byte(0) != 0);
+            SeekNamed(thread, record.Byte(0) != 0);
             break;
         case kOpWaitForFrame:
             skip = RecordsToSkip(thread, record.Word(0), record.Byte(2));
             break;
         case kOpWaitForFrameExpr:
-            skip = RecordsToSkipSpec(thread, record.Byte(0));
+            skip = RecordsToSkipNamed(thread, record.Byte(0));
             break;
         case kOpJump:
             pc = JumpTarget(block, record);

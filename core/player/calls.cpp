@@ -50,7 +50,7 @@ void SPlayer::CallFrame(ScriptThread* thread, S32 frameToRun)
 void ActionRunner::Call(ScriptThread* thread, const U8* resumeAt)
 {
     S32 frame = 0;
-    ScriptThread* target = PopFrameSpec(thread, &frame);
+    ScriptThread* target = PopFrame(thread, &frame);
     if (!target || calls.level >= SCallTable::kMaxLevels)
         return;
     ActionList*& list = calls.levels[calls.level + 1].list;
