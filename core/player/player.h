@@ -121,8 +121,8 @@ public:
     virtual void StreamPostURLNotify(const char* url, const char* target, U32 length,
                                      const char* data, void* notifyData) = 0;
     virtual void StreamGetURLNotify(const char* url, const char* target, void* notifyData) = 0;
-    // Aborts a stream; nothing of it arrives afterwards. It may be the very stream whose data is
-    // being delivered.
+    // Aborts a stream; nothing of it arrives afterwards, but StreamInDestroy still comes, from the
+    // event loop. It may be the very stream whose data is being delivered.
     virtual void CloseStream(StreamData* stream) = 0;
     // Passes a command to whatever contains the player. Neither string outlives the call.
     virtual void ProcessFSCommand(const char* command, const char* args) = 0;

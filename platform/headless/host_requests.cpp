@@ -139,6 +139,10 @@ void HostRequests::Ask(const char* url, const char* window, const char* data, U3
         return; // a browser's affair
     }
     load->fault = Fault(*load);
+    if (load->fault != nullptr) { // it only waits to be told so
+        load->http.url = Shown(load->http.url);
+        load->http.form.clear();
+    }
     waiting.push_back(std::move(load));
 }
 

@@ -1,7 +1,10 @@
 // For builds without a library that fetches from the web.
 #include "platform/headless/http.h"
 
-HttpClient::~HttpClient() = default;
+HttpClient::~HttpClient()
+{
+    multi = nullptr; // there never was one
+}
 
 bool HttpClient::Supported()
 {
