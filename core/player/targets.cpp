@@ -136,7 +136,7 @@ ScriptThread* SPlayer::FindTarget(SObject* from, const char* path, int length)
     if (from && names.AtSlash())
         at = MovieRoot(from);
     ScriptThread* found = at ? at->thread : this;
-    U64 work = 0;
+    const U64 before = scriptWork;
     for (bool first = true; names.Next(); first = false) {
         const S32 level = first ? LayerNum(names.name) : -1;
         if (names.TooLong())
@@ -147,12 +147,12 @@ ScriptThread* SPlayer::FindTarget(SObject* from, const char* path, int length)
             found = movie;
             continue;
         }
-        at = at && work <= gLimits.workPerRun / kShareOfRun ? Step(at, names.name, &work) : nullptr;
-        found = at ? at->thread : nullptr;
+        const bool affordable = scriptWork - before <= gLimits.workPerRun / kShareOfRun;
+        at = at && affordable ? Step(at, names.name, &scriptWork) : nullptr;
         if (!at)
-            break;
+            return nullptr;
+        found = at->thread;
     }
-    scriptWork += work;
     return found;
 }
 

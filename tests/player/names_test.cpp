@@ -93,7 +93,7 @@ TEST(Names, LeadToTimelinesAndVariables)
     t.ScriptThread::SetVariable("x.y", "1", 0); // by other means than its path
     for (const auto& row : Rows(3, R"(
         /a x /a:x   /a b:x /a/b:X   /a :y /a:y   /a/b /:z Z   /a _level6:v _vexel6:V
-        /a a/b /a:a/b   _level6 :w _level6:W   / f.scroll none   / /:x.y none   /a nobody:x none)")) {
+        /a a/b /a:a/b   _level6 :w _level6:W   / f.scroll none   / /:x.y none  / nobody:x none)")) {
         ScriptValue value;
         t.SetVariable(t.At(row[0]), row[1].c_str(), row[1].c_str(), 1);
         EXPECT_EQ(row[2] != "none", t.GetVariable(t.At(row[0]), row[1].c_str(), &value)) << row[1];
@@ -141,8 +141,8 @@ TEST(Properties, AreReadAndWritten)
         2 100.02 1,0,0,1 1,0,0,1    2 100.03 1,0,0,1 1.0003,0,0,1   3 50 1,0,-.8,.6 1,0,-.4,.3
         2 100 0,0,-1,0 0,1,-1,0     2 500 46e-6,61e-6,0,1 3,4,0,1   3 100 0,1,0,0 0,1,-1,0
         2 100 0,0,0,0 1,0,0,0       3 100 0,0,0,0 0,0,0,1       3 -50 2,0,1,1 2,0,-.35355,-.35355
-        10 0 1,0,1,1 1,0,1,1        10 0 0,1,2,1 1,0,1,-2       10 90 1,0,0,-1 0,1,1,0
-        10 180 0,0,0,1 0,0,0,-1   10 -450 1,0,0,1 0,-1,1,0   10 45 1,0,0,1 .7071,.7071,-.7071,.7071)")) {
+        10 0 1,0,1,1 1,0,1,1        10 720 0,1,2,1 1,0,1,-2     10 90 1,0,0,-1 0,1,1,0
+        10 180 0,0,0,1 0,0,0,-1 10 -90 1,0,0,1 0,-1,1,0 10 45 1,0,0,0 .7071,.7071,0,0)")) {
         MATRIX m[2];
         for (int k = 0; k < 2; k++) {
             double f[4];
