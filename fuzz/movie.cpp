@@ -1,4 +1,5 @@
-// A whole movie from any bytes: fed in pieces, played for 8 ticks at 64 x 64, then back.
+// A whole movie from any bytes: fed in pieces, played for 8 ticks at 64 x 64 with mouse and keys,
+// then back.
 #include "platform/headless/native_player.h"
 
 // The first byte chooses how the rest is cut and drawn, so that one input is always one run.
@@ -18,10 +19,15 @@ extern "C" int LLVMFuzzerTestOneInput(const U8* data, size_t size)
     player.EndOfData();
     for (int tick = 0; tick < 8; ++tick) {
         player.Tick();
-        SPOINT middle = {32, 32};
-        player.scene.HitTest(&middle);
-        player.scene.SetButton(player.scene.HitButton(&middle), tick & 1);
+        const S32 x = 8 + tick * 6, y = mode & 16 ? 32 : x;
+        const SPOINT pt = {x, y};
+        player.scene.HitTest(&pt);
+        player.MouseMove(x, y, 0);
+        player.MouseDown(x, y);
+        player.HandleKeyDown(mode & 32 ? 18 : 13 + tick, mode >> 7);
+        tick & 1 ? player.MouseMove(64 - x, y, 1) : player.MouseUp(x, y);
     }
+    player.CancelCapture(mode & 64);
     player.GotoFrame(3);
     player.Tick();
     player.GotoFrame(0);
