@@ -41,6 +41,8 @@ int main(int argc, char** argv)
         {"poster.vxm", MakePoster()},
         {"gallery.vxm", MakeGallery()},
         {"metamorphosis.vxm", MakeMetamorphosis()},
+        {"orchard.vxm", MakeOrchard()},
+        {"orchard_end.vxm", MakeOrchardEnd()},
         {"album.vxm", MakeAlbum(Load(folder + "album.vxm"))},
     };
     for (const auto& movie : movies) {

@@ -16,9 +16,9 @@ std::vector<U8> Committed(const std::string& name)
     return {std::istreambuf_iterator<char>(file), {}};
 }
 
-// The committed movies are what the program writes on every machine, and all of their pictures are
-// the same whether only what changed is painted, in two ticks, or everything. Where a radial span
-// starts may cost a step of its ramp.
+// The committed movies are what the program writes on every machine, and all of their pictures, or
+// those before anybody plays with them, are the same whether only what changed is painted, in two
+// ticks, or everything. Where a radial span starts may cost a step of its ramp.
 TEST(Samples, AreWhatIsCommittedAndRepaintAlike)
 {
     const struct {
@@ -31,14 +31,16 @@ TEST(Samples, AreWhatIsCommittedAndRepaintAlike)
                    {"poster", MakePoster(), 120},
                    {"gallery", MakeGallery(), 96},
                    {"metamorphosis", MakeMetamorphosis(), 96},
-                   {"album", MakeAlbum(Committed("album")), 120}};
+                   {"album", MakeAlbum(Committed("album")), 120},
+                   {"orchard", MakeOrchard(), 1},
+                   {"orchard_end", MakeOrchardEnd(), 1}};
     for (const auto& [name, made, frames] : samples) {
         SCOPED_TRACE(name);
         EXPECT_TRUE(Committed(name) == made);
         NativePlayerWnd player(160, 120);
         player.Feed(made.data(), made.size());
         player.EndOfData();
-        EXPECT_EQ(player.numFrames, frames);
+        EXPECT_GE(player.numFrames, frames);
         for (int tick = 0; tick <= frames; tick++) { // once round
             const Picture partial = PictureOf(*player.Picture());
             EXPECT_EQ(player.curFrame, tick % frames);
