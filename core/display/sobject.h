@@ -33,8 +33,8 @@ struct SObject {
     SCharacter* character; // what is shown; null only for the root. Counted as a user of the record
     U16 depth;             // ordering key among siblings
     U16 ratio;             // morph ratio
-    char* name;            // instance name, owned; null when there is none. Set by SetName only
     U32 nameHash;          // of the name, for those who look for one among many; 0 for none
+    char* name;            // instance name, owned; null when there is none. Set by SetName only
     ScriptThread* thread;  // a sprite's or movie's own timeline, else that of the parent
     STransform xform;      // relative to the parent
     SRECT devBounds;       // device units, valid after CalcUpdate
@@ -87,8 +87,9 @@ struct SObject {
     void HitTest(SObject*& hit, STransform xform, const SPOINT* pt);
     // Sets `hit` to the topmost button or selectable text field of this subtree under `pt`.
     void HitButton(SObject*& hit, STransform xform, const SPOINT* pt);
-    // Device bounds of a button's hit area; empty for what is no button or has none.
-    void CalcButtonBounds(SRECT* r);
+    // Device bounds of a button's hit area; empty for what is no button or has none. With a budget,
+    // no more records than that, which are taken off it.
+    void CalcButtonBounds(SRECT* r, U32* budget = nullptr);
     // For a mask: the next sibling when `pt` is inside it, else the first sibling beyond its range.
     SObject* HitClipper(const STransform* parentXform, const SPOINT* pt);
 
