@@ -197,6 +197,7 @@ SObject* DisplayList::HitTest(const SPOINT* pt)
     const SPOINT device = BeginHitTest(pt);
     SObject* hit = nullptr;
     root.HitTest(hit, {camera, cameraCxform}, &device);
+    work += gLimits.shapeRecords - recordsLeft;
     return hit;
 }
 

@@ -96,6 +96,7 @@ public:
     U32 recordsLeft = 0;  // shape records and styles that this repaint or hit test may read
     U32 clonedMovies = 0; // loaded movies alive that play another loader's bytes
     U32 tagsLeft = 0;     // tags that may still run in this tick; see ResetBudget
+    U64 work = 0;         // what walks have cost since ever, in the units of SLimits::workPerRun
 
     ChunkAlloc edgeAlloc;
     ChunkAlloc objectAlloc;
@@ -202,6 +203,7 @@ private:
 
     bool MayPlace(const SObject* parent, const SCharacter* character) const;
     SObject** FindLink(SObject* parent, U16 depth);
+    SObject** FindLink(SObject** list, const SObject* obj);
     void SetPlacement(SObject* obj, SObject* parent, const PlaceInfo* info);
     void NameObject(SObject* obj, const PlaceInfo* info);
     void StartObject(SObject* obj, const PlaceInfo* info);

@@ -37,6 +37,7 @@ void DisplayList::FinishHold()
     SObject* child = holdParent->bottomChild;
     holdParent = nullptr;
     for (; child; child = child->above) {
+        work++;
         if (child->serial >= holdSerial)
             NoteMask(child);
     }
@@ -48,6 +49,7 @@ SObject** DisplayList::MergeHeld(SObject** link)
 {
     SObject* old = holdList;
     SObject* fresh = *link;
+    work++;
     if (!fresh || old->depth < fresh->depth) {
         if (old->depth <= kMaxTimelineDepth) {
             DoRemove(&holdList);

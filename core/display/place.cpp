@@ -58,7 +58,16 @@ SObject** DisplayList::FindLink(SObject* parent, U16 depth)
         passed++;
     }
     ChargeTags(passed / kSiblingsPerTag);
+    work += passed;
     return link;
+}
+
+// The link of that list to the object, or the one at the list's end.
+SObject** DisplayList::FindLink(SObject** list, const SObject* obj)
+{
+    for (; *list && *list != obj; list = &(*list)->above)
+        work++;
+    return list;
 }
 
 SObject* DisplayList::FindChild(SObject* parent, U16 depth) const
@@ -221,14 +230,9 @@ void DisplayList::RemoveThisObject(SObject* obj)
 {
     if (!obj || !obj->parent)
         return;
-    SObject** link = &obj->parent->bottomChild;
-    while (*link && *link != obj)
-        link = &(*link)->above;
-    if (!*link && obj->parent == holdParent) {
-        link = &holdList;
-        while (*link && *link != obj)
-            link = &(*link)->above;
-    }
+    SObject** link = FindLink(&obj->parent->bottomChild, obj);
+    if (!*link && obj->parent == holdParent)
+        link = FindLink(&holdList, obj);
     if (*link)
         DoRemove(link);
 }

@@ -11,6 +11,10 @@
 #include "core/stream/str.h"
 #include "core/stream/tags.h"
 
+// Units of work: an object transformed, and one that is recalculated besides.
+constexpr U64 kTransformWork = 4;
+constexpr U64 kRecalculateWork = 8;
+
 static bool Inside(const SRECT& r, const SRECT& outer)
 {
     return r.xmin >= outer.xmin && r.xmax <= outer.xmax && r.ymin >= outer.ymin &&
@@ -42,6 +46,7 @@ void SObject::CalcUpdate(const MATRIX* parentMat, bool forced)
     MATRIX mat;
     MatrixConcat(&xform.mat, parentMat, &mat);
     forced = forced || dirty;
+    display->work += forced ? kRecalculateWork : kTransformWork;
     if (remaskTo != 0)
         InvalidateRemasked(); // while the children still know their old places
     if (forced)
@@ -74,6 +79,7 @@ void SObject::InvalidateRemasked()
 
 void SObject::InvalidateDrawn()
 {
+    display->work++;
     if (drawn)
         display->InvalidateRect(DrawnPlace());
     for (SObject* child = bottomChild; child; child = child->above)
@@ -235,6 +241,7 @@ static void UniteBounds(SObject* obj, const MATRIX* parentMat, SRECT* r)
 {
     MATRIX mat;
     SRECT own;
+    obj->display->work += kTransformWork;
     MatrixConcat(&obj->xform.mat, parentMat, &mat);
     if (obj->character) {
         MatrixTransformRect(&mat, &obj->character->bounds, &own);

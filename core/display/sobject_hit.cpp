@@ -6,6 +6,10 @@
 namespace {
 constexpr U32 kFieldNotSelectable = 0x1000; // of the flags that a text field's record begins with
 
+// Units of work: an object and its transform, and how many edges are one.
+constexpr U64 kObjectWork = 4;
+constexpr U32 kEdgesPerUnit = 8;
+
 bool Crosses(const REdge* e, const SPOINT* pt)
 {
     if (pt->y < e->anchor1y || pt->y >= e->anchor2y)
@@ -55,12 +59,15 @@ bool SObject::HitTestOne(const STransform* placed, const SPOINT* pt)
 bool SObject::EdgesContain(const SPOINT* pt)
 {
     bool crossed = false;
+    U32 edgesSeen = 0;
     for (const REdge* e = edges; e; e = e->next) {
+        edgesSeen++;
         if (!Crosses(e, pt))
             continue;
         CountCrossing(e);
         crossed = true;
     }
+    display->work += edgesSeen / kEdgesPerUnit;
     return crossed && TakeColorFlags();
 }
 
@@ -91,6 +98,7 @@ bool SObject::FieldContains(const MATRIX* placed, const SPOINT* pt) const
 
 void SObject::HitTest(SObject*& hit, STransform placed, const SPOINT* pt)
 {
+    display->work += kObjectWork;
     if (!visible)
         return;
     placed.Concat(&xform);
@@ -109,6 +117,7 @@ void SObject::HitTest(SObject*& hit, STransform placed, const SPOINT* pt)
 SObject* SObject::HitClipper(const STransform* parentXform, const SPOINT* pt)
 {
     STransform placed = *parentXform;
+    display->work += kObjectWork;
     placed.Concat(&xform);
     return HitTestOne(&placed, pt) ? above : FirstBeyond(clipDepth);
 }
@@ -116,7 +125,7 @@ SObject* SObject::HitClipper(const STransform* parentXform, const SPOINT* pt)
 SObject* SObject::FirstBeyond(U16 maskDepth) const
 {
     SObject* next = above;
-    while (next && next->depth <= maskDepth)
-        next = next->above;
+    for (; next && next->depth <= maskDepth; next = next->above)
+        display->work++;
     return next;
 }

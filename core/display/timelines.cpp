@@ -154,6 +154,7 @@ static SCharacter* ExchangeForGone(SCharacter* ch)
 void DisplayList::ForgetMovie(const ScriptPlayer* movie)
 {
     for (SObject* obj = objects; obj; obj = obj->nextAlive) {
+        work++;
         if (obj->character && obj->character->player == movie)
             Empty(obj);
     }
@@ -162,6 +163,7 @@ void DisplayList::ForgetMovie(const ScriptPlayer* movie)
     if (pending && pending->player == movie)
         pending = ExchangeForGone(pending);
     for (ScriptThread* thread = threads; thread; thread = thread->nextThread) {
+        work++;
         if (thread->player == movie && thread != movie)
             thread->LoseMovie();
     }

@@ -1,7 +1,7 @@
 // What records do with the value stack.
 #include "core/player/action_runner.h"
 
-#include <bit>
+#include <algorithm>
 #include <cstring>
 
 #include "core/geom/fixed.h"
@@ -13,7 +13,9 @@ namespace {
 
 constexpr U8 kPushString = 0;
 constexpr U8 kPushFloat = 1;
-constexpr S64 kBytesPerUnit = 16; // of text handled, in a unit of work
+constexpr S64 kBytesPerUnit = 32; // of text handled, in a unit of work
+constexpr U32 kMostDigits = 800;  // of a number, that count for its value
+constexpr U32 kWorkPerDigit = 2;
 constexpr char kDivisionByZero[] = "#ERROR#";
 
 } // namespace
@@ -44,14 +46,14 @@ double SPlayer::PopNum()
 
 ActionRunner::Operands ActionRunner::PopOperands()
 {
-    const double b = stack.PopNum();
-    const double a = stack.PopNum();
+    const double b = PopNumber();
+    const double a = PopNumber();
     return {a, b};
 }
 
 S32 ActionRunner::PopInt()
 {
-    return TruncateToInt(stack.PopNum());
+    return TruncateToInt(PopNumber());
 }
 
 void ActionRunner::PushNumber(double value)
@@ -75,7 +77,24 @@ void ActionRunner::PushText(const char* text, int n)
 
 void ActionRunner::ChargeText(S64 bytes)
 {
-    player->scriptWork += static_cast<U64>(bytes / kBytesPerUnit);
+    player->scene.work += static_cast<U64>(bytes / kBytesPerUnit);
+}
+
+// Short numbers are no more work than their record.
+void ActionRunner::ChargeNumber(const ScriptValue& value)
+{
+    const U32 length = value.HeapLength();
+    if (length == 0)
+        return;
+    ChargeText(length);
+    player->scene.work += std::min(length, kMostDigits) * kWorkPerDigit;
+}
+
+double ActionRunner::PopNumber()
+{
+    if (const ScriptValue* top = stack.Peek(0))
+        ChargeNumber(*top);
+    return stack.PopNum();
 }
 
 // One value a record, whatever else its payload holds.
@@ -87,7 +106,10 @@ void ActionRunner::PushRecord(const SActionRecord& record)
         const char* text = record.String(1, &size);
         PushText(text, size);
     } else if (type == kPushFloat) {
-        PushNumber(std::bit_cast<float>(record.DWord(1)));
+        const U32 bits = record.DWord(1);
+        float value;
+        std::memcpy(&value, &bits, sizeof value);
+        PushNumber(value);
     }
 }
 

@@ -48,6 +48,7 @@ private:
     const U8* JumpTarget(const SActionBlock& block, const SActionRecord& record) const;
 
     // --- stack (action_runner.cpp) ---
+    double PopNumber();
     Operands PopOperands();
     S32 PopInt();
     void PushNumber(double value);
@@ -62,6 +63,7 @@ private:
     void FirstByte();
     void Character(bool twoBytes);
     void ChargeText(S64 bytes);
+    void ChargeNumber(const ScriptValue& value);
 
     // --- timelines and objects (action_targets.cpp) ---
     void SeekTo(ScriptThread* thread, S64 frame);
@@ -95,6 +97,7 @@ private:
     SCallTable& calls;
     bool resuming = false; // the next block goes on after a call
     U32 executed = 0;      // records of this run, skipped ones included
+    U64 workLimit = 0;     // of DisplayList::work, for this run
     int requestCount = 0;
     SURLRequest requests[kMaxRequests] = {};
 };
@@ -106,7 +109,7 @@ public:
     ~TagCharge()
     {
         if (before > player->scene.tagsLeft)
-            player->scriptWork += before - player->scene.tagsLeft;
+            player->scene.work += before - player->scene.tagsLeft;
     }
     TagCharge(const TagCharge&) = delete;
     TagCharge& operator=(const TagCharge&) = delete;

@@ -31,10 +31,11 @@ bool IsProperty(S32 index)
     return index >= 0 && index < kPropCount;
 }
 
-// Corners may come in any order.
+// Corners may come in any order. One that lies as far left as can be makes no empty rectangle.
 SRECT RectOfCorners(const S32 x[2], const S32 y[2])
 {
-    return {std::min(x[0], x[1]), std::max(x[0], x[1]), std::min(y[0], y[1]), std::max(y[0], y[1])};
+    return {std::max(std::min(x[0], x[1]), kRectEmpty + 1), std::max(x[0], x[1]),
+            std::min(y[0], y[1]), std::max(y[0], y[1])};
 }
 
 } // namespace
@@ -55,6 +56,7 @@ void ActionRunner::SeekLabel(ScriptThread* thread, const SActionRecord& record)
     const char* text = record.String(0, &size);
     ScriptValue label;
     label.SetText(text, size);
+    ChargeText(size);
     TagCharge charge(player);
     const S32 frame = thread->FindLabel(label.Text());
     if (frame >= 0)
@@ -64,8 +66,10 @@ void ActionRunner::SeekLabel(ScriptThread* thread, const SActionRecord& record)
 ScriptThread* ActionRunner::PopFrame(ScriptThread* thread, S32* frame)
 {
     ScriptValue name = stack.Pop();
+    const char* text = name.Text();
+    ChargeText(name.Length());
     TagCharge charge(player);
-    return player->ResolveFrameNum(name.Text(), thread, frame);
+    return player->ResolveFrameNum(text, thread, frame);
 }
 
 void ActionRunner::SeekNamed(ScriptThread* thread, bool play)
@@ -119,7 +123,6 @@ ScriptThread* ActionRunner::PopTarget(ScriptThread* thread)
 {
     ScriptValue path = stack.Pop();
     const char* text = path.Text();
-    ChargeText(path.Length());
     return *text == 0 ? thread : FindFrom(thread, text);
 }
 
@@ -167,7 +170,12 @@ void ActionRunner::StoreProperty(ScriptThread* thread)
     double number = 0;
     if (!target || !IsProperty(index))
         return;
-    if (index == kPropName)
+    const bool named = index == kPropName;
+    if (named)
+        ChargeText(value.Length());
+    else
+        ChargeNumber(value);
+    if (named)
         player->SetPropertyStr(target, index, value.Text());
     else if (!IsTextProperty(index) && value.GetNumber(&number))
         player->SetProperty(target, index, number);
@@ -177,6 +185,7 @@ void ActionRunner::CloneSprite(ScriptThread* thread)
 {
     const S32 depth = PopInt();
     ScriptValue name = stack.Pop();
+    ChargeText(name.HeapLength());
     ScriptThread* source = PopTarget(thread);
     const SObject* obj = source ? source->rootObject : nullptr;
     if (!obj || obj->parent == &player->scene.root || depth < 0 || depth > kMaxDepth)
@@ -208,8 +217,8 @@ void ActionRunner::StartDrag(ScriptThread* thread)
     if (PopInt() == 1) {
         S32 x[2], y[2];
         for (int i = 1; i >= 0; i--) {
-            y[i] = TruncateToInt(stack.PopNum() * kTwips);
-            x[i] = TruncateToInt(stack.PopNum() * kTwips);
+            y[i] = TruncateToInt(PopNumber() * kTwips);
+            x[i] = TruncateToInt(PopNumber() * kTwips);
         }
         bounds = RectOfCorners(x, y);
     }

@@ -22,8 +22,18 @@ void SPlayer::DoActions()
     ActionRunner runner(this);
     actionDepth++;
     runner.Run();
+    EndRun();
     actionDepth--;
     runner.SendRequests();
+}
+
+void SPlayer::EndRun()
+{
+    if (!cameraWaits)
+        return;
+    cameraWaits = false;
+    SetCamera(2);
+    RefreshMenus();
 }
 
 ActionRunner::ActionRunner(SPlayer* p) : player(p), stack(p->stack), calls(p->scene.calls) {}
@@ -32,14 +42,13 @@ void ActionRunner::Run()
 {
     calls.level = 1;
     calls.levels[1] = {&player->scene.actions, nullptr, false};
-    player->scriptWork = 0;
+    workLimit = player->scene.work + gLimits.workPerRun;
     while (calls.level > 0) {
         if (calls.levels[calls.level].list->Size() > 0)
             NextBlock();
         else
             DropLevel();
     }
-    player->scriptWork = 0; // whoever looks for names outside a run has all of it
 }
 
 SActionBlock& ActionRunner::RunningBlock() const
@@ -92,13 +101,13 @@ const U8* ActionRunner::JumpTarget(const SActionBlock& block, const SActionRecor
     return at >= 0 && at <= block.end - block.body ? block.body + at : block.end;
 }
 
-// The guard against scripts that never end. False when the run is over.
+// The guard against scripts that never end. False when the run is over. The end mark of a block is
+// no record, and is not counted.
 bool ActionRunner::CountRecord()
 {
     executed++;
-    player->scriptWork++;
-    if (executed <= gLimits.actionsPerRun && player->scriptWork <= gLimits.workPerRun &&
-        !stack.overflowed)
+    player->scene.work++;
+    if (executed <= gLimits.actionsPerRun && player->scene.work <= workLimit && !stack.overflowed)
         return true;
     Abort();
     return false;
@@ -107,7 +116,7 @@ bool ActionRunner::CountRecord()
 void ActionRunner::Abort()
 {
     player->actionsAborted = true;
-    stack.overflowed = false;
+    stack.Clear(); // nobody can look at it before the movie has gone
     EndCalls(&calls);
     player->scene.actions.Clear();
 }
@@ -185,7 +194,7 @@ template <bool kTraced> void ActionRunner::RunRecords(const SActionBlock& block)
             PushBool(TruncateToInt(n.a) != 0 || TruncateToInt(n.b) != 0);
             break;
         case kOpNot:
-            PushBool(stack.PopNum() == 0);
+            PushBool(PopNumber() == 0);
             break;
         case kOpStringEquals:
             PushBool(CompareStrings() == 0);
@@ -221,7 +230,7 @@ template <bool kTraced> void ActionRunner::RunRecords(const SActionBlock& block)
             stack.Pop();
             break;
         case kOpToInteger:
-            PushNumber(std::trunc(stack.PopNum()));
+            PushNumber(std::trunc(PopNumber()));
             break;
         case kOpRandomNumber:
             PushNumber(Random(PopInt()));
@@ -281,7 +290,7 @@ template <bool kTraced> void ActionRunner::RunRecords(const SActionBlock& block)
             pc = JumpTarget(block, record);
             break;
         case kOpIf:
-            if (stack.PopNum() != 0) // so what is not a number jumps
+            if (PopNumber() != 0) // so what is not a number jumps
                 pc = JumpTarget(block, record);
             break;
         case kOpCallFrame:
@@ -294,7 +303,8 @@ template <bool kTraced> void ActionRunner::RunRecords(const SActionBlock& block)
             RecordURLExpr(thread, record.Byte(0));
             break;
         }
-        if (!CountRecord() || calls.level != level)
+        // When the movie has gone, the limits are no longer those of this run.
+        if (calls.level == 0 || !CountRecord() || calls.level != level)
             return;
     }
     calls.levels[level].list->PopFront();

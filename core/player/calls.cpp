@@ -58,7 +58,7 @@ void ActionRunner::Call(ScriptThread* thread, const U8* resumeAt)
         list = new (std::nothrow) ActionList;
     if (!list)
         return;
-    player->scriptWork += QueueFrameActions(target, frame, list);
+    player->scene.work += QueueFrameActions(target, frame, list);
     if (RunningBlock().actions)
         RunningBlock().actions = resumeAt;
     calls.level++;

@@ -7,6 +7,7 @@ void SPlayer::ControlOpen(const char* url)
     if (url != nullptr && *url != 0) {
         scene.Reset();
         ClearScript();
+        stack.Clear();
         ForgetRequests();
         FreeStr(baseURL);
         baseURL = nullptr;
@@ -21,6 +22,7 @@ void SPlayer::ControlOpen(const char* url)
 void SPlayer::ControlClose()
 {
     ClearScript();
+    stack.Clear();
     ForgetRequests();
     RefreshMenus();
 }
@@ -86,8 +88,9 @@ void SPlayer::ControlHighQuality()
 {
     highQuality = !highQuality;
     autoQuality = 0;
-    SetCamera(2);
-    RefreshMenus();
+    ShowQuality();
+    if (actionDepth == 0)
+        RefreshMenus();
 }
 
 void SPlayer::ControlViewAll()

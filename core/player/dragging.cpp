@@ -3,7 +3,6 @@
 
 #include <algorithm>
 
-#include "core/player/limits.h"
 #include "core/stream/str.h"
 
 namespace {
@@ -14,15 +13,6 @@ void ParentToScene(const SObject* obj, MATRIX* mat)
     MatrixIdentity(mat);
     for (const SObject* p = obj->parent; p; p = p->parent)
         MatrixConcat(mat, &p->xform.mat, mat);
-}
-
-// What the last hit test may have cost: a look at each object, and the shapes that it read.
-U64 HitTestWork(const DisplayList& list)
-{
-    U64 work = gLimits.shapeRecords - list.recordsLeft;
-    for (const SObject* obj = list.objects; obj; obj = obj->nextAlive)
-        work++;
-    return work;
 }
 
 } // namespace
@@ -99,7 +89,6 @@ void SPlayer::UpdateDropTarget()
     scene.CalcUpdate(); // what has moved since the last repaint is hit where it is now
     SObject* hit = scene.HitTest(&mousePt);
     obj->visible = visible;
-    scriptWork += HitTestWork(scene);
     FreeStr(obj->dropTarget);
     obj->dropTarget = hit ? GetTargetPath(hit) : nullptr;
 }

@@ -90,6 +90,7 @@ void SPlayer::ClearScript()
     EndCalls(&scene.calls);
     scene.actions.Clear();
     actionsAborted = false;
+    cameraWaits = false;
     ForgetInput();
     RectSetEmpty(&zoomRect);
     loaded = 0;

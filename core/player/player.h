@@ -56,7 +56,7 @@ public:
     FontState fontState = kFontsUntried;
     int actionDepth = 0;             // above 0 while actions run
     bool actionsAborted = false;     // a script ran away: no action runs until the movie goes
-    U64 scriptWork = 0;              // of this run, see SLimits::workPerRun: what walks adds to it
+    bool cameraWaits = false;        // a script has changed the quality: shown after the run
     ValueStack stack;                // of the scripts; what is on it stays from run to run
     ScriptTracer tracer;             // told of every record before it is executed
     S32 nextFrameTime = 0;           // clock value at which the next frame is due
@@ -116,8 +116,8 @@ public:
     // later, through StreamInNew, StreamInWrite and StreamInDestroy, never inside the call.
     // `target` names a browser window, and then there is no `notifyData`; without it the data comes
     // back here with `notifyData`. A request that is refused or fails before its stream opens ends
-    // with StreamFailed, later as well. The strings do not outlive the call; `length` counts the zero byte at the end of `data`, which begins with two
-    // header lines and a blank one.
+    // with StreamFailed, later as well. The strings do not outlive the call; `length` counts the
+    // zero byte at the end of `data`, which begins with two header lines and a blank one.
     virtual void StreamPostURLNotify(const char* url, const char* target, U32 length,
                                      const char* data, void* notifyData) = 0;
     virtual void StreamGetURLNotify(const char* url, const char* target, void* notifyData) = 0;
@@ -164,7 +164,8 @@ public:
     ScriptThread* FindTarget(SObject* from, const char* path);
     // The same for the first `length` characters of a path.
     ScriptThread* FindTarget(SObject* from, const char* path, int length);
-    // The path of an object as scripts write it; null when memory is exhausted.
+    // The path of an object as scripts write it; null when memory is exhausted, or when it would be
+    // longer than a string may be.
     char* GetTargetPath(SObject* obj);
     // Splits "target:name": the timeline before the colon, null when there is none of that path;
     // without a colon `thread`, or the player for null. *rest is what follows.
@@ -355,6 +356,8 @@ private:
     void TakeDirty();
     void BlitPending();
     void ChooseCamera();
+    void ShowQuality();
+    void EndRun();
     SRECT ClientArea();
     void PixelCamera(MATRIX* mat) const;
     void LeaveFixedScale();

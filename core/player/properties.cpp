@@ -34,14 +34,6 @@ enum Property {
 
 constexpr double kTwips = 20; // in a pixel
 
-S64 CountObjects(const SObject* obj)
-{
-    S64 n = 1;
-    for (const SObject* child = obj->bottomChild; child; child = child->above)
-        n += CountObjects(child);
-    return n;
-}
-
 double Side(S32 min, S32 max)
 {
     return static_cast<double>(static_cast<S64>(max) - min) / kTwips;
@@ -91,7 +83,6 @@ double SPlayer::ObjectProperty(SObject* obj, int index)
     case kPropHeight: {
         SRECT box;
         GetBoundingBox(obj, &box);
-        scriptWork += static_cast<U64>(CountObjects(obj));
         if (RectIsEmpty(&box))
             return 0;
         return index == kPropWidth ? Side(box.xmin, box.xmax) : Side(box.ymin, box.ymax);

@@ -14,7 +14,17 @@ void SPlayer::SetQuality(int level)
     highQuality = level > 0;
     bestQuality = level >= 2;
     autoQuality = 0;
-    SetCamera(2);
+    ShowQuality();
+}
+
+// A change of quality concerns every object and the shell: one that a script makes waits for the
+// end of the run, however often it is made.
+void SPlayer::ShowQuality()
+{
+    if (actionDepth > 0)
+        cameraWaits = true;
+    else
+        SetCamera(2);
 }
 
 // The three counts are not set back by a switch: the rule works on all ticks since the movie was

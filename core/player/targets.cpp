@@ -13,6 +13,7 @@ namespace {
 constexpr int kMostName = 127; // characters; a longer name in a path names nothing
 // The part of a run's work that one path may cost; a path that costs more names nothing.
 constexpr U32 kShareOfRun = 16;
+constexpr U32 kCharactersPerUnit = 16; // of paths, in a unit of work
 
 // The names of a path, one after the other. Several slashes are one, and one at the end is none.
 class PathNames {
@@ -113,10 +114,11 @@ void WriteNames(const SObject* obj, char* end)
     }
 }
 
+// Counts no further than a string can be long.
 size_t NamesLength(const SObject* obj)
 {
     size_t length = 0;
-    for (; !IsLevelRoot(obj); obj = obj->parent)
+    for (; length <= gLimits.stringBytes && !IsLevelRoot(obj); obj = obj->parent)
         length += static_cast<size_t>(StrLength(obj->name)) + 1;
     return length;
 }
@@ -136,7 +138,8 @@ ScriptThread* SPlayer::FindTarget(SObject* from, const char* path, int length)
     if (from && names.AtSlash())
         at = MovieRoot(from);
     ScriptThread* found = at ? at->thread : this;
-    const U64 before = scriptWork;
+    const U64 before = scene.work;
+    scene.work += static_cast<U64>(length) / kCharactersPerUnit;
     for (bool first = true; names.Next(); first = false) {
         const S32 level = first ? LayerNum(names.name) : -1;
         if (names.TooLong())
@@ -147,8 +150,8 @@ ScriptThread* SPlayer::FindTarget(SObject* from, const char* path, int length)
             found = movie;
             continue;
         }
-        const bool affordable = scriptWork - before <= gLimits.workPerRun / kShareOfRun;
-        at = at && affordable ? Step(at, names.name, &scriptWork) : nullptr;
+        const bool affordable = scene.work - before <= gLimits.workPerRun / kShareOfRun;
+        at = at && affordable ? Step(at, names.name, &scene.work) : nullptr;
         if (!at)
             return nullptr;
         found = at->thread;
@@ -170,8 +173,9 @@ char* SPlayer::GetTargetPath(SObject* obj)
         std::snprintf(prefix, sizeof prefix, "_level%d", static_cast<int>(number));
     const size_t before = std::strlen(prefix);
     const size_t length = before + NamesLength(named);
+    scene.work += obj->nesting + length / kCharactersPerUnit;
     GrowBuffer<char> path;
-    if (!path.Resize(length + 1))
+    if (length > gLimits.stringBytes || !path.Resize(length + 1))
         return nullptr;
     std::memcpy(path.data(), prefix, before);
     WriteNames(named, path.data() + length);

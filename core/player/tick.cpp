@@ -1,4 +1,5 @@
 // The tick: what happens when the shell's timer fires.
+#include "core/player/limits.h"
 #include "core/player/player.h"
 
 // When a stream sets the pace, the picture waits for it or catches up, and the clock has no say.
@@ -15,9 +16,12 @@ void SPlayer::DoPlay(int checkTime)
         return;
     nextFrameTime = now + frameDelay;
     scene.ResetBudget();
-    for (S32 i = 0; i < pace.frames; i++) {
+    U64 spent = 0; // by the runs of all these frames; the frames left come in the next tick
+    for (S32 i = 0; i < pace.frames && spent <= gLimits.workPerRun; i++) {
         AdvanceThreads(pace.thread);
+        const U64 before = scene.work;
         DoActions();
+        spent += scene.work - before;
     }
     RetestButtons();
     FollowFocus();

@@ -100,8 +100,11 @@ void ActionRunner::RecordURLExpr(ScriptThread* thread, U8 flags)
         postData.EncodeVariables(thread->vars);
     ChargeText(static_cast<S64>(fullURL.Length()) + postData.Length());
     const char* windowText = window.Text();
-    AddRequest(CopyOf(fullURL), CreateStr(windowText, window.Length()),
-               method == kMethodPost && thread ? CopyOf(postData) : nullptr, flags);
+    const bool post = method == kMethodPost && thread;
+    char* data = post ? CopyOf(postData) : nullptr;
+    if (post && !data)
+        return; // without its data it would become another request
+    AddRequest(CopyOf(fullURL), CreateStr(windowText, window.Length()), data, flags);
 }
 
 // For a window that is a path: what it names now is what is loaded into later, wherever the path
@@ -119,6 +122,7 @@ bool ActionRunner::ResolveWindow(ScriptThread* thread, ScriptValue* window, U8* 
     if (IsRootPath(window->Text())) {
         *flags = intoLevel;
         SetText(window, kRootLevel);
+        // A movie shown in a sprite counts as on layer 0 here, whatever level the sprite lies in.
         return !target || target->layerNum == 0 || SetToPath(target, window);
     }
     if (!target || !SetToPath(target, window))

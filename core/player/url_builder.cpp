@@ -2,6 +2,7 @@
 
 #include <cstdio>
 
+#include "core/display/display_list.h"
 #include "core/player/limits.h"
 #include "core/stream/script_thread.h"
 
@@ -89,7 +90,8 @@ void URLBuilder::EncodeString(const char* s)
 void URLBuilder::EncodeVariables(const SVariable* first)
 {
     bool more = false;
-    for (const SVariable* var = first; var != nullptr; var = var->next) {
+    const auto full = [this] { return static_cast<U32>(length) >= gLimits.variablesBytes; };
+    for (const SVariable* var = first; var != nullptr && !full(); var = var->next) {
         if (var->name == nullptr || var->value == nullptr)
             continue;
         if (more)
@@ -131,7 +133,11 @@ void DecodeQueryString(ScriptThread* thread, const char* text)
 {
     URLBuilder name, value;
     const char* p = text;
+    const DisplayList* scene = thread->display;
+    const U64 most = (scene ? scene->work : 0) + gLimits.workPerRun;
     while (*p != 0 && static_cast<size_t>(p - text) < gLimits.variablesBytes) {
+        if (scene && scene->work > most)
+            return; // names made to be looked up slowly
         p = DecodeUpTo(p, '=', '&', &name);
         value.Clear();
         if (*p == '=')

@@ -27,6 +27,8 @@ public:
     // The text, zero-terminated, valid until the value changes; formats a number in place.
     const char* Text();
     int Length();
+    // The length of a text that lies on the heap; 0 for any other value.
+    U32 HeapLength() const { return kind == kHeapText ? length : 0; }
     // The text as a number; false, and 0, when it is none.
     bool GetNumber(double* value) const;
     double Number() const;

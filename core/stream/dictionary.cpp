@@ -212,7 +212,15 @@ bool ScriptPlayer::CreatePixels(SCharacter* ch, int format, S32 width, S32 heigh
     allPixels += pixels;
     if (display)
         display->pixelsLeft -= pixels;
+    ChargePixels(pixels);
     return true;
+}
+
+void ScriptPlayer::ChargePixels(U64 pixels)
+{
+    constexpr U64 kPixelsPerUnit = 4;
+    if (display)
+        display->work += pixels / kPixelsPerUnit;
 }
 
 // Looking through the whole dictionary is paid for like reading as many records.

@@ -108,8 +108,12 @@ void AbsorbScans(JpegDecoder* d)
     const U64 worth = std::clamp<U64>(gLimits.jpegScanPixels / pixels, 1, kMaxScans);
     const int wanted = std::min(d->maxScans, static_cast<int>(worth));
     d->scans = 0;
-    while (d->scans < wanted && !jpeg_input_complete(info))
-        d->scans += jpeg_consume_input(info) == JPEG_SCAN_COMPLETED;
+    while (d->scans < wanted && !jpeg_input_complete(info)) {
+        if (jpeg_consume_input(info) != JPEG_SCAN_COMPLETED)
+            continue;
+        d->scans++;
+        d->ch->player->ChargePixels(pixels);
+    }
     jpeg_start_output(info, d->scans);
 }
 

@@ -42,7 +42,7 @@ public:
     U32 version = 0;
     const U8* jpegInfo = nullptr; // body of the tag with the shared JPEG tables; null: none yet
     S32 jpegInfoLen = 0;
-    bool retryImage = false; // the image tried last lacked room or tables: it may be had later
+    bool retryImage = false;      // the image tried last lacked room or tables: it may be had later
     StreamData* stream = nullptr; // the stream that feeds this movie
     bool varsMode = false;        // the stream carries variables, not a movie
     S32 varsLayer = -1;           // level that receives them
@@ -78,6 +78,8 @@ public:
     // allow them even without the pixels that nobody uses, or when enough has been decoded for one
     // repaint.
     bool CreatePixels(SCharacter* ch, int format, S32 width, S32 height, const SColorTable* ctab);
+    // Counts pixels that are decoded as work of whoever runs now.
+    void ChargePixels(U64 pixels);
     // Frees a bitmap's pixels, if there are any.
     void DropPixels(SCharacter* ch);
 

@@ -1,6 +1,7 @@
 // The variables of a timeline: a list in order of creation, with an index once it has grown.
 #include <cstdlib>
 
+#include "core/display/display_list.h"
 #include "core/player/limits.h"
 #include "core/stream/script_thread.h"
 #include "core/stream/str.h"
@@ -8,8 +9,10 @@
 namespace {
 // A list up to this length is searched from its head; beyond it the index is worth its memory.
 constexpr U32 kPlainList = 16;
-// What the heap takes for a variable beside its strings, its share of the index included.
-constexpr size_t kRecordBytes = sizeof(SVariable) + 64;
+// What a variable counts for beside its strings, its share of the index included: the same on every
+// machine, so that the limit strikes at the same variable.
+constexpr size_t kRecordBytes = 104;
+constexpr int kCharactersPerUnit = 16; // of names compared, in a unit of work
 
 SVariable* NewRecord()
 {
@@ -19,6 +22,17 @@ SVariable* NewRecord()
     if (!var)
         ReturnStrBytes(kRecordBytes);
     return var;
+}
+
+// Many names of one hash are easily made, and they may be long.
+bool IsNamed(const SVariable* var, const char* name, U32 hash, U64* work)
+{
+    ++*work;
+    if (var->hash != hash)
+        return false;
+    const int common = StrCommon(var->name, name);
+    *work += static_cast<U64>(common / kCharactersPerUnit);
+    return var->name[common] == 0 && name[common] == 0;
 }
 
 void FreeRecord(SVariable* var)
@@ -34,16 +48,13 @@ SVariable* ScriptThread::FindVariable(const char* name)
 {
     if (!name)
         return nullptr;
-    SVariable* var = vars;
-    if (!buckets) {
-        while (var && !StrEqual(var->name, name))
-            var = var->next;
-        return var;
-    }
     const U32 hash = StrHash(name);
-    var = buckets[hash & (bucketCount - 1)];
-    while (var && (var->hash != hash || !StrEqual(var->name, name)))
-        var = var->nextInBucket;
+    U64 work = 0;
+    SVariable* var = buckets ? buckets[hash & (bucketCount - 1)] : vars;
+    while (var && !IsNamed(var, name, hash, &work))
+        var = buckets ? var->nextInBucket : var->next;
+    if (display)
+        display->work += work;
     return var;
 }
 

@@ -105,7 +105,7 @@ TEST(Names, LeadToTimelinesAndVariables)
     while (far.size() < 500000)
         far += "a/../";
     EXPECT_EQ("/", t.PathOf(t.At(far)));
-    EXPECT_GE(t.scriptWork, 100000u);
+    EXPECT_GE(t.scene.work, 100000u);
     gLimits.workPerRun = 160000;
     EXPECT_EQ("none", t.PathOf(t.At(far)));
     gLimits = {};
