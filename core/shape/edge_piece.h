@@ -56,6 +56,7 @@ protected:
     // Where a curve runs flat the anti-aliasing raster's steps along it are wide. By splitting they
     // are kept to a unit or so for strokes, whose two sides must not seem to cross.
     bool exact = false;
+    DisplayList* edgeDisplay; // owner of the edge pool
 
 private:
     void SplitAtTurn(const CURVE& c);
@@ -63,6 +64,5 @@ private:
     void AddHalves(const CURVE& first, const CURVE& second);
     void AddPiece(CURVE* c);
 
-    DisplayList* edgeDisplay; // owner of the edge pool
     REdge** edgeList;
 };

@@ -74,7 +74,7 @@ void SStroker::StrokeThinCurve(const CURVE* c)
 // Curves become lines, whose crossings are exact: at this width a step astray would be a gap.
 void SStroker::StrokeThinBend(const SBend& b, int level)
 {
-    if (level < kMaxLevel && !IsNearlyStraight(b)) {
+    if (level < kMaxLevel && !IsNearlyStraight(b) && SpendSplit()) {
         const SStrokePoint p = FineMiddle(b.p1, b.control);
         const SStrokePoint q = FineMiddle(b.control, b.p2);
         const SStrokePoint m = FineMiddle(p, q);

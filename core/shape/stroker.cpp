@@ -220,7 +220,7 @@ void SStroker::StrokeBend(const SBend& b, int level)
     const EBendFate fate = Judge(b);
     if (fate == kBendKeep)
         StrokeSides(b);
-    else if (fate == kBendChord || level == kMaxLevel)
+    else if (fate == kBendChord || level == kMaxLevel || !SpendSplit())
         StrokeChord(b.p1, b.p2);
     else
         SplitBend(b, level + 1);
@@ -244,6 +244,14 @@ void SStroker::StrokeChord(const SStrokePoint& p1, const SStrokePoint& p2)
     last = EndAt(p2, normal, length);
     AddEdge(start.left, last.left);
     AddEdge(last.right, start.right);
+}
+
+bool SStroker::SpendSplit()
+{
+    U32& left = edgeDisplay->recordsLeft;
+    const bool more = left != 0;
+    left -= more;
+    return more;
 }
 
 // Both halves share the normal at the middle, where the way is that of the curve's inner legs.

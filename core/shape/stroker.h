@@ -9,7 +9,8 @@
 // itself. All pieces of an outline run clockwise on the screen. Thick strokes are the two offset
 // sides of the path with round joins and ends; thin ones (without anti-aliasing, below four
 // pixels) an outline one unit wide. Works on any coordinates; once the edge pool is exhausted it
-// does nothing more.
+// does nothing more. Halving a curve counts as a record, since a curve that leaves no edges would
+// cost its time unseen; when no records are left, curves become lines.
 class SStroker : public CEdgeCutter {
 public:
     // Edges come from `display`'s pool and go to the front of `list`.
@@ -44,6 +45,7 @@ private:
     void Join(const SStrokeEnd& from, const SStrokeEnd& to);
     void StrokeDot();
     EBendFate Judge(const SBend& b) const;
+    bool SpendSplit();
     void StrokeBend(const SBend& b, int level);
     void SplitBend(const SBend& b, int level);
     void StrokeSides(const SBend& b);

@@ -136,6 +136,16 @@ TEST(Strokes, AnyNumbersEndSoon)
         const CURVE c = {{any(), any()}, {any(), any()}, {any(), any()}, i & 2};
         EXPECT_LT(Stroke(i & 1, any(), {c}).edges, 5000u);
     }
+    // A curve that leaves no edges is paid for all the same.
+    DisplayList display;
+    REdge* list = nullptr;
+    SStroker stroker(&display, &list);
+    stroker.BeginStroke(4000, nullptr);
+    const CURVE hidden = {{0, -50000}, {9000, -90000}, {-900, -60000}, 0};
+    display.recordsLeft = 100;
+    for (int i = 0; i < 30; ++i)
+        stroker.AddStrokeCurve(&hidden);
+    EXPECT_TRUE(!list && display.recordsLeft == 0);
 }
 
 } // namespace
