@@ -171,14 +171,15 @@ bool ApngSink::WriteImage(const SRECT& r, S64 milliseconds, bool over)
 bool ApngSink::WriteShot(const PictureSpool::Shot& shot, const std::vector<U32>& before)
 {
     SRECT r = shot.changed;
-    const bool over = LaysOver(r, before);
+    bool over = LaysOver(r, before);
     S64 left = S64(shot.pictures) * form.delay;
     bool good = PackPixels(r, over ? &before : nullptr);
     for (; left > kLongest && good; left -= kLongest) {
         good = WriteImage(r, kLongest, over) && PackPixels({0, 1, 0, 1}, nullptr);
         r = {0, 1, 0, 1};
+        over = false;
     }
-    return good && WriteImage(r, left, over && r.xmax != 1);
+    return good && WriteImage(r, left, over);
 }
 
 bool ApngSink::Finish()
