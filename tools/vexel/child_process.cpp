@@ -15,9 +15,9 @@ extern char** environ;
 
 namespace {
 
-// Our SIGPIPE is ignored; the child gets the usual one back.
-int Spawn(const std::vector<std::string>& words, int input, int messages, bool sharesOutput,
-          int extra, pid_t* id)
+// The signals that we ignore the child gets back.
+int Spawn(const std::vector<std::string>& words, int input, int messages, int output, int extra,
+          pid_t* id)
 {
     std::vector<char*> arguments;
     for (const std::string& word : words)
@@ -27,7 +27,9 @@ int Spawn(const std::vector<std::string>& words, int input, int messages, bool s
     posix_spawn_file_actions_init(&files);
     posix_spawn_file_actions_adddup2(&files, input, STDIN_FILENO);
     posix_spawn_file_actions_adddup2(&files, messages, STDERR_FILENO);
-    if (!sharesOutput)
+    if (output >= 0)
+        posix_spawn_file_actions_adddup2(&files, output, STDOUT_FILENO);
+    else
         posix_spawn_file_actions_addopen(&files, STDOUT_FILENO, "/dev/null", O_WRONLY, 0);
     // Last, since any of the others may be the third. The same number on both sides stays open.
     if (extra >= 0)
@@ -37,6 +39,7 @@ int Spawn(const std::vector<std::string>& words, int input, int messages, bool s
     sigset_t usual;
     sigemptyset(&usual);
     sigaddset(&usual, SIGPIPE);
+    sigaddset(&usual, SIGXFSZ);
     posix_spawnattr_setsigdefault(&how, &usual);
     posix_spawnattr_setflags(&how, POSIX_SPAWN_SETSIGDEF);
     const int error = posix_spawnp(id, arguments[0], &files, &how, arguments.data(), environ);
@@ -62,13 +65,15 @@ void ChildProcess::Kill()
     Wait();
 }
 
-int ChildProcess::Start(const std::vector<std::string>& words, bool sharesOutput, int extra)
+// While SIGCHLD is ignored, as a caller can have left it, nobody is told how a child ended.
+int ChildProcess::Start(const std::vector<std::string>& words, int output, int extra)
 {
+    std::signal(SIGCHLD, SIG_DFL);
     int ends[2];
     said = std::tmpfile();
     if (said == nullptr || pipe2(ends, O_CLOEXEC) != 0)
         return errno;
-    const int error = Spawn(words, ends[0], fileno(said), sharesOutput, extra, &id);
+    const int error = Spawn(words, ends[0], fileno(said), output, extra, &id);
     close(ends[0]);
     if (error != 0) {
         close(ends[1]);

@@ -18,10 +18,10 @@ public:
     ChildProcess(const ChildProcess&) = delete;
     ChildProcess& operator=(const ChildProcess&) = delete;
 
-    // words[0] is looked for on the PATH. Its standard output is ours when `sharesOutput` is set
-    // and nowhere otherwise. Its descriptor 3 is our `extra`, unless that is -1. 0, or the number
-    // of the error.
-    int Start(const std::vector<std::string>& words, bool sharesOutput, int extra = -1);
+    // words[0] is looked for on the PATH. Its standard output is our descriptor `output`, or
+    // nowhere for -1; its descriptor 3 is our `extra`, unless that is -1. 0, or the number of the
+    // error.
+    int Start(const std::vector<std::string>& words, int output, int extra = -1);
     // To its standard input. False once it has stopped reading.
     bool Write(std::span<const U8> bytes);
     // Ends its input and waits for it. Empty when it did well; otherwise the first line it said, or

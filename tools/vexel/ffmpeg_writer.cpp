@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstring>
 #include <unistd.h>
+#include <utility>
 
 namespace {
 
@@ -78,15 +79,16 @@ public:
 
 private:
     Words CommandLine(const PictureForm& form) const;
-    bool ToStdout() const { return path == "-"; }
-    bool MakePart();
+    bool OpenOutput();
+    int StartEncoder(const PictureForm& form);
     bool FailEncoding(const std::string& said);
 
     std::string path;
     const VideoForm& video;
     OutputPlace place;
     ChildProcess child;
-    bool making = false; // there may be a part of the file
+    int stream = -1;     // where the encoder writes to, unless it makes a part of the file
+    bool making = false; // there may be such a part
     S32 width = 0;       // as the encoder gets them
     S32 height = 0;
     std::vector<U8> row;
@@ -123,8 +125,8 @@ Words FfmpegSink::CommandLine(const PictureForm& form) const
         Append(&words, {"-f", "wav", "-i", "pipe:3"});
         Append(&words, video.sound);
     }
-    Append(&words, video.encoder(form.alpha, !ToStdout()));
-    Append(&words, {"-f", video.muxer, ToStdout() ? "pipe:1" : "file:" + place.part});
+    Append(&words, video.encoder(form.alpha, stream < 0));
+    Append(&words, {"-f", video.muxer, stream < 0 ? "file:" + place.part : "pipe:1"});
     return words;
 }
 
@@ -133,21 +135,35 @@ bool FfmpegSink::Begin(const PictureForm& form)
     width = video.evenSides ? (form.width + 1) & ~1 : form.width;
     height = video.evenSides ? (form.height + 1) & ~1 : form.height;
     row.resize(static_cast<size_t>(width) * 4);
-    making = !ToStdout();
-    if (making && !MakePart())
+    making = true;
+    if (!OpenOutput())
         return Fail(path, Format("cannot write: %s", std::strerror(errno)));
-    const int error = child.Start(CommandLine(form), ToStdout(), form.sound);
+    const int error = StartEncoder(form);
     if (error == ENOENT)
         return Fail(path, "writing it takes ffmpeg, which is not on the PATH");
     return error == 0 || Fail(path, Format("cannot start ffmpeg: %s", std::strerror(error)));
 }
 
-// What we cannot write ourselves the encoder need not try.
-bool FfmpegSink::MakePart()
+// What we cannot write ourselves the encoder need not try. Pipes and devices it gets open: their
+// names can mean something else to it, and a pipe that closes is at its end.
+bool FfmpegSink::OpenOutput()
 {
+    stream = STDOUT_FILENO;
+    if (path == "-")
+        return true;
     place = OutputPlace(path);
-    const int fd = place.Open();
-    return fd >= 0 && close(fd) == 0;
+    stream = place.Open();
+    if (stream < 0 || !place.Beside())
+        return stream >= 0;
+    return close(std::exchange(stream, -1)) == 0;
+}
+
+int FfmpegSink::StartEncoder(const PictureForm& form)
+{
+    const int error = child.Start(CommandLine(form), stream, form.sound);
+    if (stream > STDOUT_FILENO)
+        close(stream);
+    return error;
 }
 
 bool FfmpegSink::FailEncoding(const std::string& said)
