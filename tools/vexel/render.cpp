@@ -314,8 +314,9 @@ int RenderCommand(std::span<char* const> words)
     const int code = options.Prepare();
     if (code != kExitDone)
         return code;
-    // A reader of our output that goes away shows as a failed write.
+    // A reader of our output that goes away, or a file that may not grow, shows as a failed write.
     std::signal(SIGPIPE, SIG_IGN);
+    std::signal(SIGXFSZ, SIG_IGN);
     try {
         return Render(options);
     } catch (const std::bad_alloc&) {

@@ -41,7 +41,7 @@ void SetDoomedFile(const std::string& path)
         return;
     std::memcpy(doomedFile, path.c_str(), path.size() + 1);
     armed = 1;
-    for (const int signal : {SIGINT, SIGTERM, SIGHUP})
+    for (const int signal : {SIGINT, SIGTERM, SIGHUP, SIGQUIT})
         Watch(signal);
 }
 
