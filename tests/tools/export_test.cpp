@@ -18,6 +18,15 @@ std::vector<U8> Squares()
     return m.Bytes();
 }
 
+// Of two pictures the first has a bar on the left edge, and the second a longer one.
+std::vector<U8> Bars()
+{
+    MovieWriter m(31 * 20, 21 * 20, Fps(30));
+    m.DefineShape(1, Square()).Place(1, 1, Mat::Translate(-180, 140)).Show();
+    m.Place(1, 2, Mat::Translate(-180, -40)).Place(1, 3, Mat::Translate(-180, 240)).Show().End();
+    return m.Bytes();
+}
+
 constexpr size_t kBytes = 31 * 21 * 4; // of a picture
 
 // Draws the images of an animated PNG over each other: R, G, B, A of a picture for each 33 ms.
@@ -83,6 +92,9 @@ TEST_F(Tool, ExportsWhatItRenders)
         for (size_t i = 0; i < want.size() && !skip; i += 4)
             ASSERT_EQ(0, U8(want[i + 3]) > 127 ? want.compare(i, 3, got, i, 3) : got[i + 3]);
     }
+    Write("../m", Bars());
+    const std::string bars = "render ../m --background transparent -o - --format ";
+    EXPECT_TRUE(Run(bars + "rgba").out == PlayApng(Run(bars + "apng").out));
     if (skip)
         GTEST_SKIP() << "ffmpeg is not installed: no GIF is decoded";
 }
@@ -91,7 +103,7 @@ TEST_F(Tool, ExportsAllOrNothing)
 {
     Write("../m", Squares());
     const std::string fake = "f() { printf '#!/bin/sh\n%s' \"$1\" >../ffmpeg; chmod +x ../ffmpeg;"
-                             "PATH=$PWD/..:$PATH $vexel render ../m -o -x.mp4; }; ";
+                             "PATH=$PWD/..:$PATH $vexel render ../m -o ${2:--x.mp4}; }; ";
     const std::pair<std::string, std::string> cases[] = {
         {"PATH= $vexel render ../m -o x.webm", "x.webm: writing it takes ffmpeg"},
         {fake + "f 'echo \"[x @ 1] odd\nb\" >&2; cat; exit 1'", "-x.mp4: ffmpeg: odd\n"},
@@ -99,14 +111,20 @@ TEST_F(Tool, ExportsAllOrNothing)
         {"{ $vexel render ../m -o - --format rgba --size 999x999; echo $? >../code; } | true; "
          "exit $(cat ../code)",
          "-: cannot write: "},
-        {"trap '' XFSZ; ulimit -f 1; $vexel render ../m -o x.y4m", "x.y4m: cannot write: "}};
+        {"ulimit -f 1; $vexel render ../m -o x.y4m", "x.y4m: cannot write: "}};
     for (const auto& [line, said] : cases) {
         const Outcome outcome = Shell(line);
         EXPECT_EQ(0u, outcome.err.find("vexel: " + said)) << outcome.err;
         EXPECT_EQ("1", std::to_string(outcome.code) + Files()) << line;
     }
-    const char* takesAll = "f 'for last; do :; done; wc -c >\"${last#file:}\"'; cat ./-x.mp4";
-    EXPECT_EQ(std::to_string(8 * 32 * 22 * 4) + "\n", Shell(fake + takesAll).out);
+    for (const char* takesAll : {"f 'for last; do :; done; wc -c >\"${last#file:}\"'; cat ./-x.mp4",
+                                 "f 'wc -c' '/dev/stdout --format mp4' | cat"})
+        EXPECT_EQ(std::to_string(8 * 32 * 22 * 4) + "\n", Shell(fake + takesAll).out);
+    const std::string noWait = "{ dd oflag=nonblock status=none; $vexel render ../m -o - --format ";
+    EXPECT_EQ(std::to_string(8 * 999 * 999 * 4) + "\n",
+              Shell(noWait + "rgba --size 999x999; } | { sleep 0.2; wc -c; }").out);
+    Shell("ln -s ../trap y.png.$$.part; exec $vexel render ../m -o y.png");
+    EXPECT_FALSE(Read("y.png").empty() || !Read("../trap").empty()) << Files();
 }
 
 } // namespace

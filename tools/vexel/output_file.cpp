@@ -8,6 +8,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <fcntl.h>
+#include <poll.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -36,11 +37,18 @@ std::string FollowLinks(const std::string& path)
 
 } // namespace
 
+// Standard output may have been made one that does not wait, by whoever else has it.
+static bool WaitForRoom(int fd)
+{
+    pollfd room = {fd, POLLOUT, 0};
+    return poll(&room, 1, -1) > 0 || errno == EINTR;
+}
+
 bool WriteAll(int fd, std::span<const U8> bytes)
 {
     while (!bytes.empty()) {
         const ssize_t n = write(fd, bytes.data(), bytes.size());
-        if (n < 0 && errno == EINTR)
+        if (n < 0 && (errno == EINTR || (errno == EAGAIN && WaitForRoom(fd))))
             continue;
         if (n <= 0)
             return false;
@@ -99,9 +107,13 @@ OutputPlace::OutputPlace(const std::string& name) : path(name), part(name)
     SetDoomedFile(part);
 }
 
+// What is in the way goes: a part of a program that was killed, or a link that somebody laid there
+// for us to follow.
 int OutputPlace::Open() const
 {
-    const int making = Beside() ? O_CREAT | O_TRUNC : 0;
+    const int making = Beside() ? O_CREAT | O_EXCL : 0;
+    if (Beside())
+        unlink(part.c_str());
     const int fd = open(part.c_str(), O_WRONLY | O_CLOEXEC | making, 0666);
     if (fd < 0)
         Drop();

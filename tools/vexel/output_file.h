@@ -40,8 +40,8 @@ struct OutputPlace {
     explicit OutputPlace(const std::string& name);
 
     bool Beside() const { return part != path; }
-    // A descriptor for writing the part, which is made if need be; -1, with errno set, and nothing
-    // left on failure.
+    // A descriptor for writing the part, made anew if it is another file than `path`; -1, with
+    // errno set, and nothing left on failure.
     int Open() const;
     // Puts the part in its place. On failure it is gone, and errno says why.
     bool Keep() const;
