@@ -16,12 +16,16 @@ missing_packages() {
         pkg-config --exists libjpeg || echo libjpeg-dev
         pkg-config --exists libmpg123 || echo libmpg123-dev
         pkg-config --exists libcurl || echo libcurl4-openssl-dev
+        pkg-config --exists freetype2 || echo libfreetype-dev
         [[ ${1:-} != test ]] || pkg-config --exists gtest || echo libgtest-dev
         [[ ${1:-} != test ]] || pkg-config --exists sdl2 || echo libsdl2-dev
     else
         echo libpng-dev libgif-dev zlib1g-dev libjpeg-dev libmpg123-dev libcurl4-openssl-dev \
-            ${1:+libgtest-dev libsdl2-dev}
+            libfreetype-dev ${1:+libgtest-dev libsdl2-dev}
     fi
+    # Those under the open font license; from Debian 13 on they have the older package's name.
+    grep -qs "SIL OPEN FONT LICENSE" /usr/share/doc/fonts-liberation{2,}/copyright ||
+        echo fonts-liberation2
 }
 
 # Installs what is missing, or says what to install. All words go to stderr.

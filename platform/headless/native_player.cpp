@@ -1,6 +1,10 @@
 #include "platform/headless/native_player.h"
 
 #include "platform/headless/headless_sound.h"
+#include "tools/fonts/built_in_fonts.h"
+
+#include <cstdlib>
+#include <cstring>
 
 namespace {
 
@@ -212,6 +216,10 @@ void NativePlayerWnd::UpdateCursor() {}
 
 void NativePlayerWnd::GetUnixFontData(U8** data, S32* size)
 {
-    *data = nullptr;
-    *size = 0;
+    size_t length = 0;
+    const unsigned char* movie = BuiltInFonts(&length);
+    *data = length > 0 ? static_cast<U8*>(std::malloc(length)) : nullptr;
+    *size = *data ? static_cast<S32>(length) : 0;
+    if (*data)
+        std::memcpy(*data, movie, length);
 }
