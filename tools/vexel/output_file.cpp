@@ -101,8 +101,10 @@ OutputPlace::OutputPlace(const std::string& name) : path(name), part(name)
     const bool there = stat(name.c_str(), &info) == 0;
     if (there && !S_ISREG(info.st_mode))
         return;
-    if (there)
+    if (there) {
         path = FollowLinks(name);
+        mode = (info.st_mode & 0777) | S_IWUSR;
+    }
     part = path + Format(".%d.part", static_cast<int>(getpid()));
     SetDoomedFile(part);
 }
@@ -114,7 +116,7 @@ int OutputPlace::Open() const
     const int making = Beside() ? O_CREAT | O_EXCL : 0;
     if (Beside())
         unlink(part.c_str());
-    const int fd = open(part.c_str(), O_WRONLY | O_CLOEXEC | making, 0666);
+    const int fd = open(part.c_str(), O_WRONLY | O_CLOEXEC | making, mode);
     if (fd < 0)
         Drop();
     return fd;

@@ -34,6 +34,7 @@ bool WriteAll(int fd, std::span<const U8> bytes);
 struct OutputPlace {
     std::string path; // what is to be replaced; links are followed, so that they stay links
     std::string part; // where the bytes go: `path` itself for what is written to as it is
+    U32 mode = 0666;  // permissions that the part may have: no more than what it replaces has
 
     // Without a place; "-" is no path here.
     OutputPlace() = default;
