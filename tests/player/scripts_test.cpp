@@ -44,8 +44,10 @@ std::vector<U8> MakeMovie(const Script& script, const std::string& root, int fra
 class ScriptShell : public NativePlayerWnd {
 public:
     using NativePlayerWnd::NativePlayerWnd;
+    int redraws = 0;
     void InvalidateScreenArea(const SRECT*) override
     {
+        redraws++;
         if (actionDepth > 0 && FindVariable("unload"))
             ClearScript();
     }
@@ -165,4 +167,55 @@ TEST(Scripts, LeaveWhatTheirFilesSay)
         }
     }
     gLimits = kept;
+}
+
+// Each program stays far below the limit by its records alone: it is the walks that it causes which
+// end it, soon after they have used up the work of a run.
+TEST(Scripts, PayForTheWalksTheyCause)
+{
+    const SLimits kept = gLimits;
+    const struct {
+        const char* walk;
+        const char* program;
+        int times;
+        bool ends = true;
+    } rows[] = {
+        {"children kept by a seek", "PrevFrame NextFrame", 400},
+        {"objects under the pointer", "0 0 \"a\" StartDrag EndDrag", 200},
+        {"siblings below and above", "\"a\" \"x\" 16384 CloneSprite \"a\" \"y\" 60000 CloneSprite",
+         800},
+        {"objects in a box", "\"\" 8 GetProperty Pop", 200},
+        {"names in a path", "\"\" 11 GetProperty Pop", 12}, // of "a" itself
+        {"digits of a number", "\"digits\" GetVariable Not Pop", 400},
+        {"quality", "ToggleQuality", 1001, false},
+    };
+    for (const auto& row : rows) {
+        SCOPED_TRACE(row.walk);
+        std::string text;
+        for (int i = 0; i < row.times; i++)
+            text += std::string(row.program) + " ";
+        Script script = {row.walk};
+        script.code["root 4"] = script.code["a 3"] = SplitScript(text);
+        const std::vector<U8> movie = MakeMovie(script, "root", kRootFrames);
+        ScriptShell player(100, 100);
+        player.Feed(movie.data(), movie.size());
+        player.Seek(4);
+        ScriptThread* a = player.FindTarget(nullptr, "a");
+        for (int i = 0; i < 1000; i++)
+            player.ScriptThread::CloneSprite(a, "c", 20000 + i);
+        const bool named = std::string(row.walk) == "names in a path";
+        if (named)
+            player.SetPropertyStr(a, 13, std::string(600000, 'n').c_str());
+        player.ScriptThread::SetVariable("digits", std::string(900, '7').c_str(), 0);
+        player.Push("left");
+        player.redraws = 0;
+        gLimits.workPerRun = 300000;
+        const U64 before = player.scene.work;
+        player.CallFrame(named ? a : &player, named ? 2 : 3);
+        EXPECT_EQ(row.ends, player.actionsAborted);
+        EXPECT_EQ(row.ends ? 0u : 1u, player.stack.Count());
+        EXPECT_LT(player.scene.work - before, 2 * 300000u);
+        EXPECT_LE(player.redraws, 2);
+        gLimits = kept;
+    }
 }
