@@ -142,6 +142,8 @@ void CEdgeCutter::AddHalves(const CURVE& first, const CURVE& second)
 {
     if (++depth > kMaxDepth)
         return;
+    U32& records = edgeDisplay->recordsLeft;
+    records -= records != 0; // whoever reads them stops; not all pieces leave edges to run out of
     AddCurve(&first);
     AddCurve(&second);
     --depth;
