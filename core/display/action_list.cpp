@@ -36,7 +36,7 @@ void ActionList::PushAction(const U8* actions, const U8* body, const U8* end, Mo
     if (data)
         data->AddRef();
     if (thread)
-        thread->actionsQueued = true;
+        thread->actionsQueued++;
     At(tail) = {actions, end, body, data, thread};
     tail++;
 }
@@ -59,20 +59,27 @@ bool ActionList::Grow()
     return true;
 }
 
-void ActionList::RemoveThread(const ScriptThread* thread)
+U32 ActionList::RemoveThread(ScriptThread* thread)
 {
-    for (U32 i = head; i != tail; i++) {
+    U32 i = head;
+    for (; i != tail && thread->actionsQueued > 0; i++) {
         if (At(i).thread != thread)
             continue;
         At(i).actions = nullptr;
         At(i).thread = nullptr;
+        thread->actionsQueued--;
     }
+    return i - head;
 }
 
 void ActionList::PopFront()
 {
-    MovieData* data = At(head).data;
-    At(head).data = nullptr;
+    SActionBlock& block = At(head);
+    MovieData* data = block.data;
+    if (block.thread)
+        block.thread->actionsQueued--;
+    block.data = nullptr;
+    block.thread = nullptr;
     head++;
     if (data)
         data->Release();

@@ -29,8 +29,8 @@ public:
     // Appends a block, and keeps its bytes alive; dropped silently when the queue is full.
     void PushAction(const U8* actions, const U8* body, const U8* end, MovieData* data,
                     ScriptThread* thread);
-    // Every entry of the timeline becomes null, in place.
-    void RemoveThread(const ScriptThread* thread);
+    // Every entry of the timeline becomes null, in place; the number of entries looked at.
+    U32 RemoveThread(ScriptThread* thread);
     // Both counters to 0; all blocks are let go.
     void Clear();
 

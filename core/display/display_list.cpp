@@ -132,18 +132,18 @@ void DisplayList::RemoveThread(ScriptThread* thread)
 // A block that is running goes on without its timeline; a target that goes is one never chosen.
 void DisplayList::DropActions(ScriptThread* thread)
 {
-    if (thread->actionsQueued)
-        actions.RemoveThread(thread);
+    constexpr U32 kBlocksPerUnit = 8;
+    U32 looked = actions.RemoveThread(thread);
     for (int i = 1; i <= calls.level; i++) {
         SCallLevel& level = calls.levels[i];
         if (level.target == thread) {
             level.target = nullptr;
             level.targetSet = false;
         }
-        if (level.list && thread->actionsQueued)
-            level.list->RemoveThread(thread);
+        if (level.list)
+            looked += level.list->RemoveThread(thread);
     }
-    thread->actionsQueued = false;
+    work += looked / kBlocksPerUnit;
 }
 
 void DisplayList::UnlinkThread(ScriptThread* thread)

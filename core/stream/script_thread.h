@@ -55,7 +55,7 @@ public:
     const char* label = nullptr;    // last FrameLabel seen, in the movie buffer
     DisplayList* display = nullptr; // where the timeline's objects are
     SObject* rootObject = nullptr;  // parent of everything that this timeline places
-    bool actionsQueued = false;     // blocks of actions may wait for it; see ActionList
+    U32 actionsQueued = 0;          // blocks of actions that wait for it, in all ActionLists
     bool streamStart = true;        // a block may start the streaming sound
     U8 streamFormat = 11;           // first byte of the stream head; kept, not used
     CSound streamSound;             // what the stream head says
