@@ -1,6 +1,7 @@
 // Where buttons are: the hit areas that their records describe.
 #include "core/display/button_records.h"
 #include "core/display/display_list.h"
+#include "core/player/limits.h"
 #include "core/stream/script_player.h"
 
 namespace {
@@ -25,7 +26,7 @@ void DeviceMatrix(const SObject* obj, MATRIX* mat)
     MatrixConcat(&obj->xform.mat, mat, mat);
 }
 
-// Walks the records of a button while the display list's budget lasts.
+// Walks the records of a button while the budget lasts.
 bool NextWithin(U32* budget, ButtonRecords* records, SButtonRecord* record)
 {
     if (*budget == 0)
@@ -68,7 +69,8 @@ bool SObject::ButtonContains(const STransform* placed, const SPOINT* pt)
     return false;
 }
 
-// Asks an object that is nowhere in the tree, so that nothing of the picture notices.
+// Asks an object that is nowhere in the tree, so that nothing of the picture notices. Its colours
+// are there to be switched on and off only.
 bool SObject::AreaContains(SCharacter* area, const STransform* placed, const SPOINT* pt)
 {
     SObject standIn = {};
@@ -77,22 +79,25 @@ bool SObject::AreaContains(SCharacter* area, const STransform* placed, const SPO
     standIn.CalcDevBounds(&placed->mat);
     if (RectIsEmpty(&standIn.devBounds) || !RectPointIn(&standIn.devBounds, pt))
         return false;
+    display->hitOnly = true;
     standIn.BuildEdges(placed);
+    display->hitOnly = false;
     const bool inside = standIn.EdgesContain(pt);
     standIn.FreeCache();
     return inside;
 }
 
-void SObject::CalcButtonBounds(SRECT* r)
+void SObject::CalcButtonBounds(SRECT* r, U32* budget)
 {
     RectSetEmpty(r);
     if (!character || character->type != kCharButton)
         return;
     MATRIX toDevice;
     DeviceMatrix(this, &toDevice);
+    U32 all = gLimits.buttonRecords;
     ButtonRecords records(character);
     SButtonRecord record;
-    while (NextWithin(&display->recordsLeft, &records, &record)) {
+    while (NextWithin(budget ? budget : &all, &records, &record)) {
         const SCharacter* area = HitArea(character, record);
         if (!area)
             continue;

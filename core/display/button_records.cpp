@@ -24,10 +24,9 @@ ButtonRecords::ButtonRecords(const SCharacter* button) : secondForm(IsSecondForm
 
 bool ButtonRecords::Next(SButtonRecord* record)
 {
-    if (count >= gLimits.buttonRecords)
-        return false;
     record->flags = GetByte();
-    if (record->flags == 0)
+    cut = record->flags != 0 && count >= gLimits.buttonRecords;
+    if (record->flags == 0 || cut)
         return false;
     count++;
     record->id = GetWord();
@@ -48,7 +47,7 @@ void ButtonRecords::ReadColors(SButtonRecord* record)
 
 const U8* ButtonRecords::Actions() const
 {
-    return script + pos;
+    return cut ? nullptr : script + pos;
 }
 
 ButtonConditions::ButtonConditions(const SCharacter* button) : next(0)

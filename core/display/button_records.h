@@ -24,14 +24,16 @@ public:
     // The next record; false at the zero byte or at the end of the data. The data of the character
     // is all that is read.
     bool Next(SButtonRecord* record);
-    // After the last record, in the first form of button: where the actions start.
+    // After the last record, in the first form of button: where the actions start; null when the
+    // limit cut the records off.
     const U8* Actions() const;
 
 private:
     void ReadColors(SButtonRecord* record);
 
     const bool secondForm;
-    U32 count = 0; // of the records read
+    U32 count = 0;    // of the records read
+    bool cut = false; // there are more than the limit allows
     struct CxformReader : SParser {
     } colors;             // the separate colour transforms of the first form: one for each record,
     ColorTransform color; // and the last one for all that are left

@@ -71,18 +71,22 @@ struct SoundRecord : SParser {};
 } // namespace
 
 // What is shown before and after stays as it is. The rest goes before anything comes, so that no
-// depth holds two images.
+// depth holds two images. Images go at any price; those that no tags are left for do not come until
+// the next change of state.
 void DisplayList::UpdateButton(SObject* obj, int newState)
 {
     if (!IsButton(obj) || obj->state == newState || newState < 0 || newState > kOutside)
         return;
     const U8 before = kShown[obj->state], after = kShown[newState];
     SButtonRecord record;
-    for (ButtonRecords records(obj->character); records.Next(&record); ChargeTags(1)) {
+    ButtonRecords old(obj->character), fresh(obj->character);
+    while (before && old.Next(&record)) {
+        ChargeTags(1);
         if ((record.flags & before) && !(record.flags & after))
             RemoveObject(obj, U16(record.layer + obj->depth));
     }
-    for (ButtonRecords records(obj->character); records.Next(&record); ChargeTags(1)) {
+    while (tagsLeft > 0 && fresh.Next(&record)) {
+        ChargeTags(1);
         if ((record.flags & after) && !(record.flags & before))
             PlaceButtonChild(obj, record);
     }
@@ -166,7 +170,9 @@ void DisplayList::DoButtonAction(SObject* obj, int code)
     if (!IsButton(obj) || code < 0 || code >= kTransitions)
         return;
     SButtonCondition block;
-    for (ButtonConditions chain(obj->character); chain.Next(&block);) {
+    ButtonConditions chain(obj->character);
+    while (tagsLeft > 0 && chain.Next(&block)) {
+        ChargeTags(1);
         if (block.On(code))
             QueueButtonBlock(obj, block.actions);
     }
@@ -183,7 +189,8 @@ void DisplayList::QueueClick(const SObject* obj)
     SButtonRecord passed;
     while (records.Next(&passed)) {
     }
-    QueueButtonBlock(obj, records.Actions());
+    if (records.Actions())
+        QueueButtonBlock(obj, records.Actions());
 }
 
 void DisplayList::QueueButtonBlock(const SObject* obj, const U8* block)

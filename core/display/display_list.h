@@ -86,6 +86,7 @@ public:
     const U64 soundTag;         // of the sounds that buttons start; never used again
     SRECT tabFocusRect;         // of the keyboard focus highlight; empty when none
     int useFocusRect = 1;       // the highlight is drawn
+    bool hitOnly = false;       // shapes are built for a hit test and never painted
     SButtonIdentity buttonIdentity = {};
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes all sounds; null: there are none
@@ -119,8 +120,8 @@ public:
     void DoRemove(SObject** link);
     // Removes that very object, wherever it is; null is allowed.
     void RemoveThisObject(SObject* obj);
-    // The child at a depth, or null.
-    SObject* FindChild(SObject* parent, U16 depth) const;
+    // The child at a depth, or null. Long searches use up tags.
+    SObject* FindChild(SObject* parent, U16 depth);
 
     // Bracket around a timeline's rebuild from its first frame: objects that exist before and after
     // stay, with their own timelines and state. A hold that is still open is finished first.
@@ -187,6 +188,10 @@ public:
 
     // Allows the next tick its full number of tags.
     void ResetBudget();
+
+    // The raster that built colours are for; null when they are not painted. They then need no
+    // ramps and no images.
+    CRaster* PaintedRaster() { return !hitOnly && bits && bits->HasBits() ? &raster : nullptr; }
 
     // Pool records, zeroed; null when a limit or memory forbids it.
     REdge* NewEdge() { return static_cast<REdge*>(edgeAlloc.Alloc()); }

@@ -70,11 +70,14 @@ SObject** DisplayList::FindLink(SObject** list, const SObject* obj)
     return list;
 }
 
-SObject* DisplayList::FindChild(SObject* parent, U16 depth) const
+SObject* DisplayList::FindChild(SObject* parent, U16 depth)
 {
+    U32 passed = 0;
     SObject* child = parent->bottomChild;
-    while (child && child->depth < depth)
+    for (; child && child->depth < depth; passed++)
         child = child->above;
+    work += passed;
+    ChargeTags(passed / kSiblingsPerTag);
     return child && child->depth == depth ? child : nullptr;
 }
 

@@ -1,7 +1,8 @@
 // The order in which Tab visits the buttons.
-#include "core/player/player.h"
-
 #include <algorithm>
+
+#include "core/player/limits.h"
+#include "core/player/player.h"
 
 namespace {
 
@@ -21,7 +22,7 @@ void CollectButtons(SPlayer* player, SObject* parent)
         SRECT bounds;
         RectSetEmpty(&bounds);
         if (obj->character->type == kCharButton)
-            obj->CalcButtonBounds(&bounds);
+            obj->CalcButtonBounds(&bounds, &player->scene.recordsLeft);
         if (MeetsView(bounds, player->scene))
             player->AddButton(obj, &bounds);
         CollectButtons(player, obj);
@@ -62,10 +63,12 @@ void ButtonSort(ButtonWeight* list, int last)
     });
 }
 
-// Depth first and from the lowest up, then by weight: the lower one of equals comes first.
+// Depth first and from the lowest up, then by weight: the lower one of equals comes first. All the
+// buttons share the records that a hit test may read.
 void SPlayer::BuildButtonTabMap()
 {
     RemoveAllButtons();
+    scene.recordsLeft = gLimits.shapeRecords;
     CollectButtons(this, &scene.root);
     ButtonSort(tabMap.data(), NumButtons() - 1);
 }

@@ -10,11 +10,6 @@ bool OutgrowsEdges(const SRECT& r)
     return r.xmin < -kEdgeReach || r.xmax > kEdgeReach || r.ymin < -kEdgeReach ||
            r.ymax > kEdgeReach;
 }
-
-CRaster* PaintedRaster(DisplayList* display)
-{
-    return display->bits && display->bits->HasBits() ? &display->raster : nullptr;
-}
 } // namespace
 
 SCharacterParser::SCharacterParser(SObject* object, ScriptPlayer* dictionary, const U8* data,
@@ -29,7 +24,7 @@ bool SCharacterParser::BuildEdges(bool readStyles, const SRECT* devBounds)
     depth = 0;
     edgesLost = false;
     hugeCoords = OutgrowsEdges(*devBounds);
-    raster = PaintedRaster(display);
+    raster = display->PaintedRaster();
     if (readStyles) {
         if (!(endEdges ? GetMorphStyles() : GetStyles()))
             return false;
@@ -106,7 +101,7 @@ RColor* CreateClipColor(DisplayList* display, RColor** list)
     RColor* color = display->NewColor();
     if (!color)
         return nullptr;
-    CRaster* raster = PaintedRaster(display);
+    CRaster* raster = display->PaintedRaster();
     color->SetUp(raster);
     color->colorType = kColorClip;
     color->transparent = 1;

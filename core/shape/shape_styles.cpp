@@ -251,7 +251,7 @@ RColor* CreateSolidColor(DisplayList* display, RColor** list, SRGB value,
     RColor* color = display->NewColor();
     if (!color)
         return nullptr;
-    CRaster* raster = display->bits && display->bits->HasBits() ? &display->raster : nullptr;
+    CRaster* raster = display->PaintedRaster();
     color->SetUp(raster);
     color->order = order;
     color->nextColor = *list;
