@@ -180,7 +180,7 @@ TEST(Scripts, PayForTheWalksTheyCause)
         int times;
         bool ends = true;
     } rows[] = {
-        {"children kept by a seek", "PrevFrame NextFrame", 400},
+        {"children kept by a seek", "GotoFrame 2 GotoFrame 1", 400},
         {"objects under the pointer", "0 0 \"a\" StartDrag EndDrag", 200},
         {"siblings below and above", "\"a\" \"x\" 16384 CloneSprite \"a\" \"y\" 60000 CloneSprite",
          800},
