@@ -8,6 +8,9 @@
 struct SLimits {
     // Declared movie length. A longer one is an out-of-memory error of the loader: nothing plays.
     U32 movieBytes = 256u << 20;
+    // Bytes of all movies of the process, as declared. One that would exceed it does not play, as
+    // if it were too long itself.
+    U32 allMovieBytes = 512u << 20;
     // Pixels of a drawing surface. A larger one is not created.
     U32 surfacePixels = 64u << 20;
     // Pixels of one image, which take up to 4 bytes each. A larger one is not decoded: fills with
@@ -51,6 +54,9 @@ struct SLimits {
     U32 allStringBytes = 64u << 20;
     // Variables of one timeline. Further names are dropped.
     U32 variables = 16384;
+    // Of these, names that share a place in the index, which only chosen ones do. Further ones are
+    // dropped.
+    U32 variablesAlike = 32;
     // Bytes of a stream of variables; the rest is dropped.
     U32 variablesBytes = 4u << 20;
     // Tags that all timelines together execute in one tick, with whatever is charged like tags

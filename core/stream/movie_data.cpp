@@ -3,13 +3,23 @@
 #include <cstdlib>
 #include <new>
 
+#include "core/player/limits.h"
+
+namespace {
+size_t liveBytes = 0; // of all movies; the player's thread only
+} // namespace
+
 MovieData* MovieData::Create(S32 size)
 {
+    const size_t count = static_cast<size_t>(size);
+    if (count > gLimits.allMovieBytes || liveBytes > gLimits.allMovieBytes - count)
+        return nullptr;
     MovieData* data = new (std::nothrow) MovieData;
     if (!data)
         return nullptr;
     data->size = size;
-    data->bytes = static_cast<U8*>(std::calloc(static_cast<size_t>(size) + 1, 1));
+    liveBytes += count;
+    data->bytes = static_cast<U8*>(std::calloc(count + 1, 1));
     if (data->bytes)
         return data;
     data->Release();
@@ -19,6 +29,7 @@ MovieData* MovieData::Create(S32 size)
 MovieData::~MovieData()
 {
     std::free(bytes);
+    liveBytes -= static_cast<size_t>(size);
 }
 
 void MovieData::Release()

@@ -10,7 +10,7 @@
 class MovieData final : public CSoundHolder {
 public:
     // Room for `size` bytes, all zero, and one zero byte more, with one reference; null when there
-    // is no memory.
+    // is no memory, or the limit on the bytes of all movies is exhausted.
     static MovieData* Create(S32 size);
 
     // --- the player's thread ---

@@ -140,7 +140,10 @@ U32 StrHash(const char* s)
     U32 hash = 2166136261u;
     for (; *s; s++)
         hash = (hash ^ Fold(*s)) * 16777619u;
-    return hash;
+    // So far the low bits, which choose a place in an index, depend on the low bits alone.
+    hash = (hash ^ hash >> 16) * 0x85EBCA6Bu;
+    hash = (hash ^ hash >> 13) * 0xC2B2AE35u;
+    return hash ^ hash >> 16;
 }
 
 S32 ToInt(const char* s)

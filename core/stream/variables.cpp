@@ -24,6 +24,15 @@ SVariable* NewRecord()
     return var;
 }
 
+// Names are seldom that much alike unless they were made to be: looking them up must stay cheap.
+bool IsCrowded(const SVariable* var)
+{
+    U32 n = 0;
+    for (; var; var = var->nextInBucket)
+        n++;
+    return n >= gLimits.variablesAlike;
+}
+
 // Many names of one hash are easily made, and they may be long.
 bool IsNamed(const SVariable* var, const char* name, U32 hash, U64* work)
 {
@@ -79,6 +88,9 @@ SVariable* ScriptThread::NewVariable(const char* name)
     const int nameLen = StrLength(name);
     if (name[nameLen] != 0)
         return nullptr; // cut, it would be the name of another variable
+    const U32 hash = StrHash(name);
+    if (buckets && IsCrowded(buckets[hash & (bucketCount - 1)]))
+        return nullptr;
     char* copy = CreateStr(name, nameLen);
     SVariable* var = copy ? NewRecord() : nullptr;
     if (!var) {
@@ -86,7 +98,7 @@ SVariable* ScriptThread::NewVariable(const char* name)
         return nullptr;
     }
     var->name = copy;
-    var->hash = StrHash(copy);
+    var->hash = hash;
     (varsTail ? varsTail->next : vars) = var;
     varsTail = var;
     variableCount++;
