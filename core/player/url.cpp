@@ -15,6 +15,12 @@ const char* OrEmpty(const char* s)
     return s != nullptr ? s : "";
 }
 
+// Longer than strings may be: what is left of it would ask for something else.
+bool IsCut(const char* s)
+{
+    return s != nullptr && s[StrLength(s)] != 0;
+}
+
 } // namespace
 
 void SPlayer::GetURL(const char* url, const char* window, const char* postData, int flags)
@@ -22,6 +28,7 @@ void SPlayer::GetURL(const char* url, const char* window, const char* postData, 
     url = OrEmpty(url);
     window = OrEmpty(window);
     if (const char* command = SkipPrefix(url, "FSCommand:")) {
+        firstLoad = 0; // nothing comes of it
         ProcessFSCommand(command, window);
         return;
     }
@@ -103,7 +110,9 @@ LoadInfo* SPlayer::NewLoadInfo(S32 layer, const char* target, bool loadVars)
 void SPlayer::NetscapeDoURL(const char* url, const char* window, const char* postData,
                             LoadInfo* info)
 {
-    if (url == nullptr) { // memory is exhausted
+    if (url == nullptr || IsCut(url) || IsCut(postData)) { // memory may be exhausted
+        if (info == nullptr && window == nullptr)
+            firstLoad = 0;
         StreamFailed(info);
         return;
     }
