@@ -3,8 +3,11 @@
 #include "core/player/relative_url.h"
 #include "core/stream/str.h"
 
+#include <algorithm>
 #include <cstdlib>
 #include <fcntl.h>
+#include <filesystem>
+#include <limits.h>
 #include <string_view>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -35,6 +38,12 @@ std::string RealPath(const std::string& path)
     const std::string result = real != nullptr ? real : "";
     std::free(real);
     return result;
+}
+
+// An absolute path without "." and "..", as it is written: nothing is looked up.
+std::string Fold(const std::string& path)
+{
+    return std::filesystem::path(path).lexically_normal().string();
 }
 
 bool IsBelow(const std::string& path, const std::string& dir)
@@ -87,21 +96,38 @@ bool AccessPolicy::AllowDir(const std::string& dir)
     struct stat info = {};
     if (real.empty() || stat(real.c_str(), &info) != 0 || !S_ISDIR(info.st_mode))
         return false;
+    std::error_code error;
     dirs.push_back(real);
+    namedDirs.push_back(real);
+    namedDirs.push_back(Fold(std::filesystem::absolute(dir, error).string()));
     return true;
 }
 
 void AccessPolicy::SetOrigin(const std::string& url)
 {
     const URLParts parts = SplitURL(url.c_str());
-    origin = url;
-    netMovie = IsNet(parts);
-    folder = IsScheme(parts.scheme, "file") ? RealPath(DirName(Decode(parts.path))) : "";
+    const std::string dir = IsScheme(parts.scheme, "file") ? DirName(Decode(parts.path)) : "";
+    netMovie = false;
+    origins.clear();
+    NoteMovie(url);
+    folder = RealPath(dir);
+    namedFolder = Fold(dir);
 }
 
 void AccessPolicy::NoteMovie(const std::string& url)
 {
-    netMovie = netMovie || IsNet(SplitURL(url.c_str()));
+    if (!IsNet(SplitURL(url.c_str())))
+        return;
+    netMovie = true;
+    if (!IsOrigin(url))
+        origins.push_back(url);
+}
+
+bool AccessPolicy::IsOrigin(const std::string& url) const
+{
+    return std::any_of(origins.begin(), origins.end(), [&url](const std::string& each) {
+        return MachineEqual(each.c_str(), url.c_str());
+    });
 }
 
 // What the form of a URL allows.
@@ -113,6 +139,8 @@ Access AccessPolicy::Split(const std::string& url) const
     if (HasControls(url))
         return Refuse("control characters in a URL");
     if (IsNet(parts)) {
+        if (parts.authority.empty())
+            return Refuse("no machine is named");
         const bool named = parts.authority.find('@') != std::string_view::npos;
         return named ? Refuse("a user's name in a URL") : Access();
     }
@@ -122,11 +150,22 @@ Access AccessPolicy::Split(const std::string& url) const
     access.isFile = true;
     if (!parts.authority.empty() && !IsScheme(parts.authority, "localhost"))
         return Refuse("a file of another machine");
-    const std::string path = Decode(parts.path);
-    if (HasControls(path))
+    access.path = Decode(parts.path);
+    if (HasControls(access.path))
         return Refuse("control characters in a path");
-    access.path = RealPath(path);
-    return access.path.empty() ? Refuse("there is no such file") : access;
+    if (access.path.rfind('/', 0) != 0 || access.path.size() >= PATH_MAX)
+        return Refuse("there is no such file");
+    return access;
+}
+
+// A path that is not even written as one below an allowed folder is not looked up: that alone can
+// reach other machines, or wait for them.
+bool AccessPolicy::IsNamedWell(const std::string& path) const
+{
+    for (const std::string& dir : namedDirs)
+        if (IsBelow(path, dir))
+            return true;
+    return !netMovie && (IsBelow(path, folder) || IsBelow(path, namedFolder));
 }
 
 bool AccessPolicy::MayReadFile(const std::string& path) const
@@ -137,30 +176,45 @@ bool AccessPolicy::MayReadFile(const std::string& path) const
     return !netMovie && IsBelow(path, folder);
 }
 
+Access AccessPolicy::CheckFile(Access access) const
+{
+    const char* const kOutside = "outside the movie's folder";
+    access.path = Fold(access.path);
+    if (!IsNamedWell(access.path))
+        return Refuse(kOutside);
+    access.path = RealPath(access.path);
+    if (access.path.empty())
+        return Refuse("there is no such file");
+    return MayReadFile(access.path) ? access : Refuse(kOutside);
+}
+
 Access AccessPolicy::Check(const std::string& url) const
 {
     const Access access = Split(url);
     if (access.refusal != nullptr)
         return access;
     if (access.isFile)
-        return MayReadFile(access.path) ? access : Refuse("outside the movie's folder");
-    if (netAllowed)
-        return access;
-    const bool own = IsNet(SplitURL(origin.c_str())) && MachineEqual(origin.c_str(), url.c_str());
-    return own ? access : Refuse("the network is not allowed");
-}
-
-Access AccessPolicy::CheckRedirect(const std::string& url) const
-{
-    const Access access = Check(url);
-    return access.isFile ? Refuse("the web leads to a file") : access;
+        return CheckFile(access);
+    if (netMovie)
+        return IsOrigin(url) ? access : Refuse("a movie from the web reaches its own machine only");
+    return netAllowed ? access : Refuse("the network is not allowed");
 }
 
 Access AccessPolicy::CheckOpen(const std::string& url) const
 {
-    const Access access = Split(url);
-    const bool granted = access.refusal != nullptr || access.isFile || netAllowed;
-    return granted ? access : Refuse("the network is not allowed");
+    Access access = Split(url);
+    if (access.refusal != nullptr)
+        return access;
+    if (!access.isFile)
+        return netAllowed ? access : Refuse("the network is not allowed");
+    access.path = RealPath(access.path);
+    return access.path.empty() ? Refuse("there is no such file") : access;
+}
+
+Access AccessPolicy::CheckRedirect(const std::string& url, bool byUser) const
+{
+    const Access access = byUser ? CheckOpen(url) : Check(url);
+    return access.isFile ? Refuse("the web leads to a file") : access;
 }
 
 std::string FileURL(const std::string& path)
@@ -181,14 +235,16 @@ std::string FileURL(const std::string& path)
     return url;
 }
 
-// Opening a pipe or a device must neither wait nor have an effect; it is looked at before it is
-// read.
+// Opening a pipe or a device must neither wait nor have an effect, so it is looked at before; and
+// again after, as another may have come in its place.
 int OpenRegular(const std::string& path, unsigned long long mostBytes, const char** refusal)
 {
-    const int fd = open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY);
+    constexpr int kFlags = O_RDONLY | O_CLOEXEC | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY;
     struct stat info = {};
+    const bool other = lstat(path.c_str(), &info) == 0 && !S_ISREG(info.st_mode);
+    const int fd = other ? -1 : open(path.c_str(), kFlags);
     *refusal = nullptr;
-    if (fd < 0 || fstat(fd, &info) != 0)
+    if (!other && (fd < 0 || fstat(fd, &info) != 0))
         *refusal = "it cannot be read";
     else if (!S_ISREG(info.st_mode))
         *refusal = "it is no regular file";

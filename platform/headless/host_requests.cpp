@@ -15,6 +15,7 @@ constexpr size_t kBlock = 64 * 1024;       // bytes handed to the player at once
 constexpr size_t kRecordBytes = 16u << 20; // of all requests that are written down,
 constexpr size_t kMostRecorded = 65536;    // and how many
 constexpr size_t kShown = 300;             // bytes of a URL in a message
+constexpr int kMostComplaints = 64;
 constexpr int kRedirects = 5;
 constexpr int kStep = 50; // milliseconds of one wait
 
@@ -53,14 +54,9 @@ std::string Shown(const std::string& url)
 {
     std::string text = url.substr(0, kShown);
     for (char& c : text)
-        if (static_cast<unsigned char>(c) < 0x20 || c == 0x7F)
+        if (static_cast<unsigned char>(c) < 0x20 || static_cast<unsigned char>(c) >= 0x7F)
             c = '?';
     return text;
-}
-
-void Complain(const std::string& url, const std::string& why)
-{
-    std::fprintf(stderr, "vexel: %s: %s\n", Shown(url).c_str(), why.c_str());
 }
 
 // A user names a file by its path, too.
@@ -114,7 +110,8 @@ const char* HostRequests::Fault(const Load& load)
     const bool tooMany = TooMany();
     if (tooMany && !load.byUser)
         return "refused: too many requests in a second";
-    if (waiting.size() + net.size() + (serving != nullptr ? 1 : 0) >= gLimits.openStreams)
+    const size_t streams = waiting.size() + net.size() + (serving != nullptr ? 1 : 0);
+    if (streams >= gLimits.openStreams && !load.byUser)
         return "refused: too many streams at once";
     if (load.http.form.size() > gLimits.postBytes)
         return "refused: too much data to send";
@@ -156,7 +153,7 @@ void HostRequests::Close(const StreamData* stream)
     if (serving != nullptr && &serving->stream == stream)
         serving->closed = true;
     for (const LoadPtr& load : net)
-        if (&load->stream == stream)
+        if (load != nullptr && &load->stream == stream)
             load->closed = true;
 }
 
@@ -188,9 +185,19 @@ void HostRequests::Shutdown()
     net.clear();
 }
 
+// What goes wrong may go wrong in every frame.
+void HostRequests::Complain(const Load& load, const std::string& why)
+{
+    if (!load.byUser && ++complaints > kMostComplaints)
+        return;
+    std::fprintf(stderr, "vexel: %s: %s\n", Shown(load.http.url).c_str(), why.c_str());
+    if (complaints == kMostComplaints)
+        std::fprintf(stderr, "vexel: further failures of the movie's requests are not told\n");
+}
+
 void HostRequests::Fail(Load* load, const std::string& why)
 {
-    Complain(load->http.url, why);
+    Complain(*load, why);
     player->StreamFailed(load->notifyData);
     load->notifyData = nullptr;
 }
@@ -228,7 +235,7 @@ void HostRequests::ServeFile(Load* load, const std::string& path)
     } while (n > 0 && Push(load, block.data(), static_cast<size_t>(n)));
     close(fd);
     if (n < 0)
-        Complain(load->http.url, "it cannot be read to its end");
+        Complain(*load, "it cannot be read to its end");
     End(load);
     serving = nullptr;
 }
@@ -270,8 +277,9 @@ void HostRequests::End(Load* load)
 
 bool HostRequests::HasPatience() const
 {
-    return std::any_of(net.begin(), net.end(),
-                       [](const LoadPtr& load) { return load->waited < kPatience; });
+    return allWaited < kAllPatience && std::any_of(net.begin(), net.end(), [](const LoadPtr& load) {
+               return load->waited < kPatience;
+           });
 }
 
 void HostRequests::ServeNet()
@@ -280,11 +288,16 @@ void HostRequests::ServeNet()
     while (goOn) {
         const S64 start = Milliseconds();
         client.Run(HasPatience() ? kStep : 0);
+        const S64 gone = Milliseconds() - start;
+        allWaited += gone;
         for (const LoadPtr& load : net)
-            load->waited += Milliseconds() - start;
-        net.erase(std::remove_if(net.begin(), net.end(),
-                                 [this](const LoadPtr& load) { return !Advance(load.get()); }),
-                  net.end());
+            load->waited += gone;
+        // The player may close any of them meanwhile: each stays in its place until all have had
+        // their turn.
+        for (LoadPtr& load : net)
+            if (!Advance(load.get()))
+                load.reset();
+        net.erase(std::remove(net.begin(), net.end(), nullptr), net.end());
         goOn = !net.empty() && HasPatience();
     }
 }
@@ -314,7 +327,7 @@ bool HostRequests::FinishNet(Load* load)
         return Redirect(load);
     const bool success = http.status >= 200 && http.status <= 299;
     if (!http.failure.empty() && load->open)
-        Complain(http.url, http.failure);
+        Complain(*load, http.failure);
     else if (!http.failure.empty())
         Fail(load, http.failure);
     else if (!success)
@@ -331,7 +344,7 @@ bool HostRequests::Redirect(Load* load)
 {
     HttpTransfer& http = load->http;
     const std::string target = http.location;
-    const Access access = policy.CheckRedirect(target);
+    const Access access = policy.CheckRedirect(target, load->byUser);
     const char* refusal = access.refusal;
     if (++load->redirects > kRedirects)
         refusal = "it leads from one place to another";

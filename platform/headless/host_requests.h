@@ -24,8 +24,9 @@ struct HostRequest {
 };
 
 // The requests of one player and the streams that answer them. Nothing arrives inside a request;
-// all of it comes from Deliver. Refusals are a line each on standard error, and StreamFailed. The
-// player must outlive it but for its destruction, before which Shutdown is called.
+// all of it comes from Deliver. Refusals are a line each on standard error, up to a number, and
+// StreamFailed. The player must outlive it but for its destruction, before which Shutdown is
+// called.
 class HostRequests {
 public:
     explicit HostRequests(SPlayer* owner) : player(owner) {}
@@ -37,7 +38,8 @@ public:
     void Command(const char* command, const char* args);
     void Close(const StreamData* stream);
     // Answers what was asked for before this call: files at once and whole; from the network what
-    // has come, for which it waits up to kPatience for each answer in all.
+    // has come, for which it waits up to kPatience for each answer in all, and up to kAllPatience
+    // for all of them: however many pictures are made, servers that are silent cost no more.
     void Deliver();
     // Ends all streams and requests.
     void Shutdown();
@@ -50,7 +52,8 @@ public:
     AccessPolicy policy;
 
 private:
-    static constexpr S32 kPatience = 5000; // milliseconds
+    static constexpr S32 kPatience = 5000;     // milliseconds for one answer,
+    static constexpr S32 kAllPatience = 60000; // and for all
     // A request that will be answered, or is being.
     struct Load {
         StreamData stream;
@@ -74,6 +77,7 @@ private:
     void Open(Load* load);
     bool Push(Load* load, const U8* data, size_t n);
     void End(Load* load);
+    void Complain(const Load& load, const std::string& why);
     void Fail(Load* load, const std::string& why);
     void ServeNet();
     bool HasPatience() const;
@@ -92,4 +96,6 @@ private:
     U32 asked = 0;
     U32 session = 0; // of the player, whose first request was the user's
     bool loadedRoot = false;
+    S64 allWaited = 0; // milliseconds of patience that are gone
+    int complaints = 0;
 };

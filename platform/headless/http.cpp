@@ -8,7 +8,9 @@
 namespace {
 
 constexpr long kConnectSeconds = 15;
-constexpr long kSilentSeconds = 30; // without a byte a transfer fails
+constexpr long kSilentSeconds = 30; // without a byte a transfer fails,
+constexpr long kMostSeconds = 600;  // and after so many in any case
+constexpr U64 kPageBytes = 65536;   // of a page that goes with an error or a redirect
 
 // What is not allowed in a request line is encoded; a movie writes spaces as they are.
 std::string CleanURL(const std::string& url)
@@ -32,16 +34,21 @@ S32 StatusOf(const HttpTransfer& transfer)
     return static_cast<S32>(code);
 }
 
-// Pages that go with an error or a redirect are not what was asked for. The transfer ends when the
-// movie gets too long.
+bool IsSuccess(S32 status)
+{
+    return status >= 200 && status <= 299;
+}
+
+// Pages that go with an error or a redirect are not what was asked for, and are not read to their
+// end. The transfer ends when the movie gets too long.
 size_t TakeData(char* data, size_t size, size_t count, void* context)
 {
     auto* transfer = static_cast<HttpTransfer*>(context);
     const size_t n = size * count;
     transfer->status = StatusOf(*transfer);
-    if (transfer->status < 200 || transfer->status > 299)
-        return n;
     transfer->received += n;
+    if (!IsSuccess(transfer->status))
+        return transfer->received > kPageBytes ? 0 : n;
     if (transfer->received > gLimits.movieBytes)
         return 0;
     transfer->body.insert(transfer->body.end(), data, data + n);
@@ -57,6 +64,16 @@ void LimitToWeb(CURL* easy)
 #endif
 }
 
+// Not waiting for the name of a machine to be found.
+void LeaveQuickly(CURL* easy)
+{
+#if LIBCURL_VERSION_NUM >= 0x075700
+    curl_easy_setopt(easy, CURLOPT_QUICK_EXIT, 1L);
+#else
+    static_cast<void>(easy);
+#endif
+}
+
 void SetUp(CURL* easy, HttpTransfer* transfer)
 {
     LimitToWeb(easy);
@@ -64,8 +81,10 @@ void SetUp(CURL* easy, HttpTransfer* transfer)
     curl_easy_setopt(easy, CURLOPT_FOLLOWLOCATION, 0L);
     curl_easy_setopt(easy, CURLOPT_NOSIGNAL, 1L);
     curl_easy_setopt(easy, CURLOPT_CONNECTTIMEOUT, kConnectSeconds);
+    curl_easy_setopt(easy, CURLOPT_TIMEOUT, kMostSeconds);
     curl_easy_setopt(easy, CURLOPT_LOW_SPEED_LIMIT, 1L);
     curl_easy_setopt(easy, CURLOPT_LOW_SPEED_TIME, kSilentSeconds);
+    LeaveQuickly(easy);
     curl_easy_setopt(easy, CURLOPT_WRITEFUNCTION, TakeData);
     curl_easy_setopt(easy, CURLOPT_WRITEDATA, transfer);
     curl_easy_setopt(easy, CURLOPT_PRIVATE, transfer);
@@ -86,7 +105,8 @@ void Finish(CURL* easy, CURLcode result)
     transfer->status = StatusOf(*transfer);
     if (curl_easy_getinfo(easy, CURLINFO_REDIRECT_URL, &location) == CURLE_OK && location)
         transfer->location = location;
-    if (result != CURLE_OK)
+    const bool pageLeft = result == CURLE_WRITE_ERROR && !IsSuccess(transfer->status);
+    if (result != CURLE_OK && !pageLeft)
         transfer->failure = curl_easy_strerror(result);
     transfer->done = true;
 }
@@ -107,6 +127,7 @@ bool HttpClient::Supported()
 void HttpClient::Start(HttpTransfer* transfer)
 {
     transfer->status = 0;
+    transfer->received = 0;
     transfer->done = false;
     transfer->location.clear();
     if (multi == nullptr && curl_global_init(CURL_GLOBAL_DEFAULT) == CURLE_OK)

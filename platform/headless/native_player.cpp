@@ -64,6 +64,7 @@ void NativePlayerWnd::StartFeeding()
     feeding = true;
     sizeReported = false;
     startedOnce = false;
+    fedLeft = false;
     firstLoad = 1;
     requests.ForgetRoot();
     requests.policy.SetOrigin(movieURL);
@@ -83,7 +84,8 @@ void NativePlayerWnd::Feed(const U8* data, size_t n)
             AdjustWindow(PixelsOf(frame.xmin, frame.xmax), PixelsOf(frame.ymin, frame.ymax));
         }
         PushDataComplete();
-        startedOnce = startedOnce || Started();
+        fedLeft = fed.player != this; // by actions of its first frame, which has been
+        startedOnce = startedOnce || Started() || fedLeft;
         data += block;
         n -= block;
     }

@@ -37,6 +37,8 @@ public:
     // Brings what movies have asked for. Tick begins with it; without ticks, as after ControlOpen,
     // the caller does it.
     void Deliver();
+    // The movie that was fed last has unloaded itself while it was: what comes now is another's.
+    bool FedMovieLeft() const { return fedLeft; }
     // What movies have asked for, in order: all of it, refused or not.
     const std::vector<HostRequest>& Requests() const { return requests.All(); }
 
@@ -93,6 +95,7 @@ private:
     bool sizeReported = false;
     bool startedOnce = false; // the movie that was fed, or one in its place
     bool feeding = false;     // a movie is being fed, wanted or not
+    bool fedLeft = false;     // its own actions have unloaded it
     StreamData fed;
     std::string movieURL;
     HostRequests requests{this};

@@ -3,6 +3,8 @@
 #include "core/player/random.h"
 #include "core/stream/movie_data.h"
 
+#include <csignal>
+
 // The same dice for every playing: the sound of a video comes from one of its own.
 MovieRun::MovieRun(const PlayOptions& options, MovieInput* movie)
     : player(options.width, options.height), input(*movie), hand(options.input),
@@ -12,8 +14,10 @@ MovieRun::MovieRun(const PlayOptions& options, MovieInput* movie)
     player.PlayThrough(&mixer);
     if (options.movie != "-")
         player.SetMovieFile(options.movie);
-    if (options.allowNet)
+    if (options.allowNet) {
+        std::signal(SIGPIPE, SIG_IGN); // a server that hangs up is no reason to end
         player.AllowNet();
+    }
     if (!options.allowDir.empty())
         player.AllowDir(options.allowDir);
     if (options.trace)
@@ -47,9 +51,10 @@ bool MovieRun::FeedBlock()
     return failure == kExitDone;
 }
 
+// What follows the movie may have no end.
 void MovieRun::FeedAll()
 {
-    while (FeedBlock()) {
+    while (!player.Complete() && FeedBlock()) {
     }
 }
 

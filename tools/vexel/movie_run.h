@@ -33,7 +33,10 @@ public:
     int Failure() const { return failure; }
     // The movie has unloaded itself, or another has taken its place: its data is not wanted any
     // more.
-    bool Gone() const { return own != nullptr && player.sharedScript != own; }
+    bool Gone() const
+    {
+        return player.FedMovieLeft() || (own != nullptr && player.sharedScript != own);
+    }
     // A movie that ended too early is worth a word, even when all could be had from it.
     void ComplainTruncated() const;
 
