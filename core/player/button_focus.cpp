@@ -74,6 +74,7 @@ void SPlayer::BeforeRemoval(SObject* obj)
         ButtonFocusRemove();
 }
 
+// Not where the pointer is: the next movie may come up under it.
 void SPlayer::ForgetInput()
 {
     drag.object.Set(nullptr);
@@ -84,5 +85,4 @@ void SPlayer::ForgetInput()
     RemoveAllButtons();
     scene.textUnderMouse = 0;
     panning = 0;
-    mouseState = -1;
 }

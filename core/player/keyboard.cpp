@@ -101,17 +101,20 @@ int FocusKeyDown(SPlayer* player, int key)
 
 } // namespace
 
-// All blocks are queued before the first runs, for a block may remove buttons.
+// All blocks are queued before the first runs, for a block may remove buttons, or move the one that
+// has the focus.
 int SPlayer::HandleKeyDown(int key, int modifiers)
 {
     if (!BeginInput())
         return 0;
     if (key > 0 && QueueKeyBelow(&scene.root, key)) {
         DoActions();
+        FollowFocus();
         UpdateScreen();
         return 1;
     }
     if (TabKeyDown(key, modifiers)) {
+        FollowFocus();
         UpdateScreen();
         return 1;
     }

@@ -91,9 +91,9 @@ void SPlayer::MouseUp(S32 x, S32 y)
 
 void SPlayer::CancelCapture(int release)
 {
+    panning = 0;
     if (!BeginInput())
         return;
-    panning = 0;
     mouseState = release ? -1 : 0;
     if (release && LetGoOfButton(&scene)) {
         DoActions();

@@ -207,7 +207,15 @@ TEST(Input, PanningFollowsTheHandUntilItLetsGo)
     EXPECT_EQ("024602", player.Log());
     player.Keys({kTab, kTab});
     player.ControlClose();
-    EXPECT_TRUE(RectIsEmpty(&player.scene.tabFocusRect) && player.mouseState == -1);
+    EXPECT_TRUE(RectIsEmpty(&player.scene.tabFocusRect));
+    StreamData in; // the next movie comes up under a pointer at rest
+    const std::vector<U8> next = Stage().Button(2).Spread({{0, 0}}).Bytes();
+    player.StreamInNew(&in, "next", nullptr);
+    player.StreamInWrite(&in, next.data(), S32(next.size()));
+    player.mouseState = 0;
+    player.DoPlay(0);
+    EXPECT_EQ(2, player.GetCursorType());
+    player.StreamInDestroy(&in);
 }
 
 // The focus stays with what stands in the place of the button that had it, and its highlight, if it
