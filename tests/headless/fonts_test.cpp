@@ -45,7 +45,7 @@ TEST_F(Fonts, AreWholeAndMeasured)
     for (U16 id = 0; const char* name : {"_sans", "_serif", "_typewriter"}) {
         const SFont font = Font(++id);
         const auto width = [&](U32 code) { return font.Advance(U32(font.FindGlyph(code))); };
-        EXPECT_EQ(name, font.Name());
+        ASSERT_EQ(name, font.Name());
         for (U32 code = 0x20; code <= 0xFF; code++)
             EXPECT_EQ(code < 0x7F || code >= 0xA0, width(code) > 0) << code;
         EXPECT_TRUE(font.Descent() > 200 && font.Ascent() > 800 && font.Ascent() < 1000);
