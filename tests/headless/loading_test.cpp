@@ -79,19 +79,32 @@ struct Server {
     // A form ends as the test's does.
     void Run()
     {
-        for (int fd; (fd = accept(listener, nullptr, nullptr)) >= 0; close(fd)) {
+        for (int fd; (fd = accept(listener, nullptr, nullptr)) >= 0;) {
             char block[4096];
             last.clear();
             do
                 last.append(block, size_t(recv(fd, block, sizeof block, 0)));
             while (!last.ends_with(last[0] == 'P' ? "%20" : "\r\n\r\n"));
-            const std::string answer = "HTTP/1.0 " + answers[last.substr(0, last.find(" HTTP"))];
-            send(fd, answer.data(), answer.size(), MSG_NOSIGNAL);
+            held.emplace_back(fd, "HTTP/1.0 " + answers[last.substr(0, last.find(" HTTP"))]);
+            if (held.size() == together)
+                Answer();
         }
     }
+    // Several are answered at once, and not closed at once.
+    void Answer()
+    {
+        for (const auto& [fd, answer] : held)
+            send(fd, answer.data(), answer.size(), MSG_NOSIGNAL);
+        usleep(together > 1 ? 200000 : 0);
+        for (const auto& [fd, answer] : held)
+            close(fd);
+        held.clear();
+    }
 
-    std::string base, last;                     // URL; request
-    std::map<std::string, std::string> answers; // by method and path: all that is sent
+    std::string base, last;                        // URL; request
+    std::map<std::string, std::string> answers;    // by method and path: all that is sent
+    std::vector<std::pair<int, std::string>> held; // connections and what they will get
+    size_t together = 1;
     int listener = socket(AF_INET, SOCK_STREAM, 0);
     std::thread thread;
 };
@@ -165,6 +178,14 @@ TEST_F(Loading, AMovieLoadsItself)
     player.ControlOpen((home / "none.vxm").c_str());
     player.Tick();
     EXPECT_EQ(0, player.firstLoad);
+    const std::vector<U8> bytes = writer.Bytes();
+    NativePlayerWnd other{0, 0};
+    other.SetMovieFile(home / "m.vxm");
+    other.Feed(bytes.data(), bytes.size());
+    EXPECT_TRUE(other.FedMovieLeft() && other.CanTick());
+    Write(home / "m.vxm", MovingSquare(3));
+    other.Tick();
+    EXPECT_TRUE(other.gotHeader && other.CanTick());
 }
 
 TEST_F(Loading, FromTheWebWhenAllowed)
@@ -195,6 +216,20 @@ TEST_F(Loading, FromTheWebWhenAllowed)
     player.Tick();
     EXPECT_EQ(0, player.layers->curFrame);
     EXPECT_EQ("-folder", Ask("v t.txt")) << "the web could read it";
+    EXPECT_EQ("-only", Ask("http://localhost/"));
+    EXPECT_EQ("3", Ask(server.base + "a/v"));
+    EXPECT_TRUE(player.AllowDir(home) && Ask("v t.txt") == "1");
+    // The third takes the place of the second, which is still coming, just when the first has come.
+    const std::string text(movie.begin(), movie.end());
+    server.answers["GET /1"] = server.answers["GET /3"] =
+        "200 OK\r\nContent-Length: " + std::to_string(text.size()) + "\r\n\r\n" + text;
+    server.answers["GET /2"] = "200 OK\r\nContent-Length: 999\r\n\r\n" + text.substr(0, 40);
+    server.together = 3;
+    for (const std::string path : {"1", "2", "3"})
+        player.GetURL((server.base + path).c_str(), path == "1" ? "_level1" : "_level2", nullptr,
+                      0);
+    player.Deliver();
+    EXPECT_TRUE(player.layers->Complete() && player.layers->nextLayer->Complete());
 }
 
 } // namespace

@@ -60,7 +60,7 @@ TEST(URL, VariablesAreEncodedAndDecoded)
     std::istringstream cases(
         "x=a%41b+c x=aAb+c x=%G1 x=1 x=%4Gy x=y x=% x= x=%4 x= a=%26%3D&b=1=2 a=%26%3D&b=1%3D2 "
         "a=1&A=B.~+e a=B%2E%7E+e a=%00b a= a&b=&c=%c3%A9 a=&b=&c=%C3%A9 "
-        "abcdefghijklm=1&b=2 abcdefghijklm=1");
+        "abcdefghijklm=1&b=2 abcdefghijklm=1 x=1%&y=2&z x=1y%3D2&z=");
     gLimits.variablesBytes = 16;
     for (std::string text, expected; cases >> text >> expected;) {
         ScriptThread thread;
@@ -116,6 +116,10 @@ TEST(URL, RequestsGoWhereTheyShould)
         player.GetURL("c", "w", "x=1", 2);
         const char head[] = "post Content-type: application/x-www-form-urlencoded\n";
         EXPECT_EQ(head + std::string("Content-length: 3\n\nx=1\n\0\n", 25), player.Asked());
+        const std::string most(gLimits.stringBytes, 'x'); // cut, more would be something else
+        player.GetURL("c", "w", (most + "y").c_str(), 2);
+        player.GetURL(("http://" + most).c_str(), "_level1", nullptr, 0);
+        EXPECT_EQ("", player.Asked());
         for (void* info : player.infos)
             player.StreamFailed(info);
     }
@@ -150,6 +154,24 @@ TEST(Loading, FirstMovieComesLikeAllOthers)
     EXPECT_EQ("get d -\n", player.Asked());
     EXPECT_TRUE(next.player == player.layers && !player.Started());
     player.StreamInDestroy(&next);
+}
+
+// One that there is no room for does not play, until another has gone.
+TEST(Loading, MoviesShareOneLimit)
+{
+    const std::vector<U8> movie = MovingSquare(3);
+    AskedShell player(movie);
+    gLimits.allMovieBytes = U32(2 * movie.size());
+    std::string played;
+    for (const char* level : {"_level1", "_level2", "_level1"}) {
+        StreamData in;
+        player.GetURL("b", level, nullptr, 0);
+        player.Begin(&in, "b", movie);
+        played += in.player->gotHeader ? "y" : "n";
+        player.StreamInDestroy(&in);
+    }
+    EXPECT_EQ("yny", played);
+    gLimits = {};
 }
 
 // A movie has the place, name and depth of the sprite, and timelines inside; variables come when
