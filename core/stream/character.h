@@ -41,7 +41,7 @@ struct SButtonPart {
 struct SFontPart {
     const U8* info; // body of the font information record, null when none
     S32 infoLen;    // bytes from `info` to the end of its tag
-    void* cache;    // cleared; for whoever shows text
+    void* cache;    // from malloc, freed with the record; for whoever shows text
     U16 glyphCount; // with-layout form only, else 0
     U16 flags;      // the with-layout form's first word, else 0
     U16 distance;   // bytes from after the flags word to after the glyph count

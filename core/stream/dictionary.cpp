@@ -113,6 +113,8 @@ void ScriptPlayer::DestroyCharacter(SCharacter* ch)
 {
     if (ch->type == kCharBitmap)
         DropPixels(ch);
+    if (ch->type == kCharFont)
+        std::free(ch->font.cache);
     characterCount--;
     charAlloc.Free(ch);
 }
