@@ -43,7 +43,7 @@ struct StreamScene {
         }
     }
 
-    SObject* At(U16 depth) const
+    SObject* At(U16 depth)
     {
         return movie.rootObject ? list.FindChild(movie.rootObject, depth) : nullptr;
     }

@@ -205,7 +205,7 @@ struct NamedSprite : StreamScene {
         writer.Place2(3, options).Show(2).End();
         return writer;
     }
-    void ExpectCopy(U16 depth, const char* name, U32 ratio) const
+    void ExpectCopy(U16 depth, const char* name, U32 ratio)
     {
         const SObject* copy = At(depth);
         ASSERT_NE(copy, nullptr);
