@@ -29,9 +29,9 @@ enum ECaretMove : U8 {
 
 // Holds the text, lays it out in the field's box and keeps what of it is scrolled into view. All
 // points are twips in the field's own space, scrolling included; no camera comes into it. Carets
-// are byte offsets from 0 to Length(); one beyond counts as Length(). There is always at least one
-// line, and line indices beyond the last count as the last. One that is where two lines of a
-// paragraph meet belongs to the second.
+// are byte offsets from 0 to Length(), a greater one counts as Length(); where two lines of a
+// paragraph meet the caret belongs to the second. There is always at least one line, and a line
+// index beyond the last is answered with the last line's bytes. Needs a format before the rest.
 //
 // An edit lays out only lines that it can change, so that its cost does not grow with the text. No
 // memory is taken once the buffers have grown to the text.
@@ -102,7 +102,7 @@ private:
     bool InsideBreak(U32 offset) const;
     S64 Room(bool opens) const;
     bool Opens(U32 line) const { return line == 0 || Line(line - 1).hard; }
-    bool EndsByRoom(U32 line) const { return line + 1 < lines.size() && !lines[line].hard; }
+    bool EndsByRoom(U32 line) const { return size_t(line) + 1 < lines.size() && !lines[line].hard; }
     S64 LineX(U32 line) const;
     U32 LastCaret(U32 line) const;
     U32 Step(U32 offset, bool forth) const;
