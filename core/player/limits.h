@@ -39,8 +39,8 @@ struct SLimits {
     // Built gradient ramps alive in one display list. A gradient without one shows what lies below
     // it.
     U32 liveRamps = 65536;
-    // Records and styles that shapes may read for one repaint or hit test. A shape that comes later
-    // is not drawn this time.
+    // Records and styles that shapes may read for one repaint or hit test; where curves are cut and
+    // halved, each piece counts too. A shape that comes later is not drawn this time.
     U32 shapeRecords = 8u << 20;
     // Records of one button. Further ones, and with them the actions of the older form of button,
     // are not there.

@@ -172,7 +172,7 @@ public:
     ScriptThread* ResolveVariable(const char* path, ScriptThread* thread, const char** rest);
     // "target:frame" with a number from 1 or a label: the timeline and its frame from 0; null when
     // either is not there.
-    ScriptThread* ResolveFrameNum(const char* spec, ScriptThread* thread, S32* frame);
+    ScriptThread* ResolveFrameNum(const char* frameName, ScriptThread* thread, S32* frame);
     // The value of a variable by its path, or of a text field's scroll position; null when absent.
     char* GetVariable(ScriptThread* thread, const char* path);
     // The same as a value for the stack; false, and empty, when absent.

@@ -24,14 +24,14 @@ bool IsFrameNumber(const char* text)
 }
 
 // A frame from 0; negative when it is not there. A sign belongs to the number, or to the label.
-S32 FrameOf(ScriptThread* thread, const char* spec)
+S32 FrameOf(ScriptThread* thread, const char* frameName)
 {
-    const bool sign = *spec == '+' || *spec == '-';
-    const char* digits = sign ? spec + 1 : spec;
+    const bool sign = *frameName == '+' || *frameName == '-';
+    const char* digits = sign ? frameName + 1 : frameName;
     if (!IsFrameNumber(digits))
-        return thread->FindLabel(spec);
+        return thread->FindLabel(frameName);
     const S32 number = ToInt(digits);
-    return (*spec == '-' ? -number : number) - 1;
+    return (*frameName == '-' ? -number : number) - 1;
 }
 
 } // namespace
@@ -47,10 +47,10 @@ ScriptThread* SPlayer::ResolveVariable(const char* path, ScriptThread* thread, c
     return FindTarget(thread->rootObject, path, static_cast<int>(colon - path));
 }
 
-ScriptThread* SPlayer::ResolveFrameNum(const char* spec, ScriptThread* thread, S32* index)
+ScriptThread* SPlayer::ResolveFrameNum(const char* frameName, ScriptThread* thread, S32* index)
 {
     const char* rest;
-    ScriptThread* target = ResolveVariable(spec, thread, &rest);
+    ScriptThread* target = ResolveVariable(frameName, thread, &rest);
     const S32 found = target ? FrameOf(target, rest) : -1;
     if (found < 0)
         return nullptr;

@@ -38,7 +38,7 @@ constexpr char kHelp[] =
     "  --input EVENTS               a file with an event a line, done to the movie at picture N:\n"
     "                               N move|down|up X Y, N key CODE [shift] [ctrl] [alt],\n"
     "                               N text STRING\n"
-    "  --allow-net                  the movie may read from the network\n"
+    "  --allow-net                  the movie may read from the network, and send what it reads\n"
     "  --allow-dir DIR              it may read files in DIR too\n"
     "  --trace                      each action on stderr, as it is executed\n"
     "\n"
