@@ -3,9 +3,14 @@
 
 #include <algorithm>
 
+#include "core/geom/fixed.h"
 #include "core/stream/str.h"
 
 namespace {
+
+// Pixels; a pointer farther out counts as being there. No picture reaches so far, and what scripts
+// are likely to scale it by does not overflow.
+constexpr S32 kFarthest = 1 << 15;
 
 // The transform from the coordinates in which `obj` is placed to those of the scene.
 void ParentToScene(const SObject* obj, MATRIX* mat)
@@ -44,7 +49,8 @@ void SPlayer::EndDrag()
 SPOINT SPlayer::DragPoint(const SPOINT* pt) const
 {
     const S32 unit = scene.antialias ? 4 : 1;
-    SPOINT p = {pt->x * unit, pt->y * unit};
+    SPOINT p = {std::clamp(pt->x, -kFarthest, kFarthest) * unit,
+                std::clamp(pt->y, -kFarthest, kFarthest) * unit};
     MATRIX mat;
     MatrixInvert(&scene.camera, &mat);
     MatrixTransformPoint(&mat, &p, &p);
@@ -63,7 +69,8 @@ void SPlayer::UpdateDragObject(const SPOINT* pt)
     SPOINT p = DragPoint(pt);
     if (!drag.lockCenter) {
         const SPOINT start = DragPoint(&drag.start);
-        p = {drag.origin.x + p.x - start.x, drag.origin.y + p.y - start.y};
+        p = {Saturate32(static_cast<S64>(drag.origin.x) + p.x - start.x),
+             Saturate32(static_cast<S64>(drag.origin.y) + p.y - start.y)};
     }
     if (!RectIsEmpty(&drag.bounds)) {
         p.x = std::clamp(p.x, drag.bounds.xmin, drag.bounds.xmax);

@@ -175,6 +175,7 @@ TEST(Drag, FollowsThePointerInItsParent)
     EXPECT_EQ("400 0 /a/c", t.Drag(45, 75, "/a/b"));
     t.StartDrag(t.At("/a/b"), false, &swapped);
     EXPECT_EQ("450 -10 ", t.Drag(100, 160, "/a/b"));
+    EXPECT_EQ("450 0 ", t.Drag(45, kS32Max, "/a/b")) << "far out is far out";
     EXPECT_EQ("400 0 /a/c", t.Drag(45, 75, "/a/b")) << "held where it was";
     t.mousePt = {5, 5};
     t.EndDrag();
