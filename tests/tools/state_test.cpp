@@ -159,6 +159,15 @@ TEST_F(Tool, PlaysLoadersAndLeavers)
                    R"("command":"go","args":"now"},{"kind":"url","url":"file:///tmp/vexel-test-)",
                    R"(/v.txt","window":"_level0",)" + none + R"({"kind":"url","url":"file:///)",
                    R"(/p.html","window":"_blank",)"});
+    // From a folder below the file lies outside, until it is allowed.
+    MovieWriter asker(200, 200);
+    asker.DoAction(AssembleScript("\"../v.txt\" \"_level0\" GetURLExpr 128")).Show(3).End();
+    std::filesystem::create_directory(folder + "../in");
+    Write("../in/asker", asker.Bytes());
+    const Outcome refused = Run("state ../in/asker --frame 2");
+    EXPECT_TRUE(refused.code == 0 && refused.out.find("\"x\"") == std::string::npos);
+    ExpectInOrder(refused.err, {"v.txt: refused"});
+    ExpectInOrder(Run("state ../in/asker --frame 2 --allow-dir ..").out, {"\"x\" = \"7\"\n"});
     EXPECT_EQ(0, Run("render ../leaver -o %d.png").code);
     EXPECT_EQ("1.png 2.png 3.png 4.png 5.png", Files());
     EXPECT_EQ(0xFFC81E1Eu, Load("2.png").At(5, 5));
