@@ -168,6 +168,17 @@ void DisplayList::FreeEdges(REdge* edges)
     }
 }
 
+void DisplayList::FreeColors(RColor* colors)
+{
+    while (colors) {
+        RColor* next = colors->nextColor;
+        colors->FreeCache();
+        ReleaseCharacter(colors->bitmapCharacter);
+        colorAlloc.Free(colors);
+        colors = next;
+    }
+}
+
 void DisplayList::FreeCache()
 {
     root.FreeCacheTree();

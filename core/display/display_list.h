@@ -3,6 +3,7 @@
 #pragma once
 
 #include "core/display/action_list.h"
+#include "core/display/edit_text.h"
 #include "core/display/object_ref.h"
 #include "core/display/place_info.h"
 #include "core/display/sobject.h"
@@ -91,6 +92,7 @@ public:
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes all sounds; null: there are none
     int editTextFlag = 0;          // some text field draws with a device font
+    EditText::List fields;         // the text fields of all objects
     SCharacter* pending = nullptr; // retained for a placement that waits for a removal
     U64 pixelsLeft = 0;            // of images that may be decoded for this repaint or hit test
     bool colorsLost = false;       // an object that is being built has got fewer than it needs
@@ -186,6 +188,9 @@ public:
     // Queues a block of actions in a button's data, for the button's timeline.
     void QueueButtonBlock(const SObject* obj, const U8* block);
 
+    void FreeEdges(REdge* edges);
+    void FreeColors(RColor* colors);
+
     // Allows the next tick its full number of tags.
     void ResetBudget();
 
@@ -242,7 +247,7 @@ private:
     void MakeDisjoint();
     void PaintBackground(RColor* color, REdge edges[2]);
     void PaintFocus(RColor* color, REdge** edges);
-    void FreeEdges(REdge* edges);
+    void PrepareField(const SCharacter* character);
 
     ObjectRef* refs = nullptr; // all that point at objects of this list
     U32 nextSerial = 1;

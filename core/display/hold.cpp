@@ -1,5 +1,6 @@
 // The bracket around a timeline's rebuild: objects that exist before and after it survive.
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 
 #include "core/stream/character.h"
 
@@ -40,6 +41,8 @@ void DisplayList::FinishHold()
         work++;
         if (child->serial >= holdSerial)
             NoteMask(child);
+        if (child->editText)
+            child->editText->UpdateFromVariable();
     }
 }
 

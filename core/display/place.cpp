@@ -81,6 +81,13 @@ SObject* DisplayList::FindChild(SObject* parent, U16 depth)
     return child && child->depth == depth ? child : nullptr;
 }
 
+// Before anything is searched: loading the fonts places and removes an object.
+void DisplayList::PrepareField(const SCharacter* character)
+{
+    if (character->type == kCharEditText && splayer)
+        splayer->LoadBuiltInFonts();
+}
+
 // A second object at an occupied depth lands below the one that is there.
 SObject* DisplayList::PlaceObject(SObject* parent, const PlaceInfo* info)
 {
@@ -88,6 +95,7 @@ SObject* DisplayList::PlaceObject(SObject* parent, const PlaceInfo* info)
         parent = &root;
     if (!MayPlace(parent, info->character))
         return nullptr;
+    PrepareField(info->character);
     SObject* obj = static_cast<SObject*>(objectAlloc.Alloc());
     if (!obj)
         return nullptr;
@@ -149,6 +157,9 @@ void DisplayList::StartObject(SObject* obj, const PlaceInfo* info)
     case kCharLoadedMovie:
         StartLoadedMovie(obj, info);
         break;
+    case kCharEditText:
+        obj->MakeEditText();
+        break;
     default:
         break;
     }
@@ -169,6 +180,8 @@ SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
 {
     if (!parent)
         parent = &root;
+    if ((info->flags & PlaceInfo::kCharacter) && info->character)
+        PrepareField(info->character);
     SObject* obj = *FindLink(parent, info->depth);
     if (!obj || obj->depth != info->depth || obj->puppet)
         return nullptr;
@@ -177,6 +190,7 @@ SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
         SCharacter* old = obj->character;
         obj->character = info->character;
         RetainCharacter(obj->character);
+        obj->MakeEditText();
         ReleaseCharacter(old);
         NoteMask(obj);
     }

@@ -4,6 +4,7 @@
 #include <algorithm>
 
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 #include "core/player/limits.h"
 #include "core/shape/character_parser.h"
 #include "core/shape/text_records.h"
@@ -114,6 +115,10 @@ void SObject::BuildEdges(const STransform* placed)
     case kCharText:
         BuildTextEdges(this, placed);
         break;
+    case kCharEditText:
+        if (editText)
+            editText->Build(placed);
+        break;
     default:
         return;
     }
@@ -125,11 +130,12 @@ void SObject::BuildEdges(const STransform* placed)
 }
 
 // Lines are as wide as their shape is scaled on the average, and never thinner than a pixel: under
-// some transforms they lie outside the bounds, as does all of a shape whose bounds are wrong.
+// some transforms they lie outside the bounds, as does all of a shape whose bounds are wrong. What
+// a text field draws is kept inside its bounds.
 void SObject::FindReach()
 {
     SRECT all = devBounds;
-    for (const REdge* e = edges; e; e = e->next) {
+    for (const REdge* e = editText ? nullptr : edges; e; e = e->next) {
         const SRECT piece = {std::min({e->anchor1x, e->controlx, e->anchor2x}),
                              std::max({e->anchor1x, e->controlx, e->anchor2x}),
                              std::min(e->anchor1y, e->controly),
@@ -195,13 +201,10 @@ void SObject::FreeCache()
         p->unbuiltBelow = 1;
     display->FreeEdges(edges);
     edges = nullptr;
-    while (colors) {
-        RColor* next = colors->nextColor;
-        colors->FreeCache();
-        ReleaseCharacter(colors->bitmapCharacter);
-        display->colorAlloc.Free(colors);
-        colors = next;
-    }
+    display->FreeColors(colors);
+    colors = nullptr;
+    if (editText)
+        editText->FreeCache();
 }
 
 void SObject::FreeCacheTree()
@@ -228,6 +231,7 @@ void SObject::Free()
     if (display->holdParent == this)
         display->DropHeld();
     FreeCache();
+    FreeEditText();
     LeaveTimeline();
     ReleaseCharacter(character);
     character = nullptr;

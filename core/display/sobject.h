@@ -7,8 +7,8 @@
 
 class CRaster;
 class DisplayList;
+class EditText;
 class ScriptThread;
-struct EditText;
 struct RColor;
 struct REdge;
 struct SCharacter;
@@ -50,7 +50,7 @@ struct SObject {
     char* dropTarget;      // owned; path of the object that it was last dropped over
     REdge* edges;          // cached, device units
     RColor* colors;        // of those edges
-    EditText* editText;    // of a text field, owned
+    EditText* editText;    // of a text field, owned; null without memory for one
     U8 built;              // edges and colours are those of the shape, even when there are none
     U8 unbuiltBelow;       // some object below may not be built
     U32 serial;            // never the same for two objects of one list: tells a recycled record
@@ -93,6 +93,19 @@ struct SObject {
     // For a mask: the next sibling when `pt` is inside it, else the first sibling beyond its range.
     SObject* HitClipper(const STransform* parentXform, const SPOINT* pt);
 
+    // The character has become a text field, or may have been one: makes the field, which takes its
+    // variable's text, unless an open hold has made the object.
+    void MakeEditText();
+    void FreeEditText();
+    // For any object, of all text fields of its display list that are bound to a variable of the
+    // timeline: they show its new value. With flag 0 the one that has the keyboard focus does not.
+    void UpdateEditText(const ScriptThread* timeline, const char* varName, const char* value,
+                        int flag);
+    enum EScroll { kGetScroll, kGetMaxScroll, kSetScroll };
+    // Reads a scroll position of the first of these fields, or sets those of all; false when there
+    // is none.
+    bool ScrollEditText(const ScriptThread* timeline, const char* varName, int what, S32* scroll);
+
     // Gives the cached edges and colours back to the pools.
     void FreeCache();
     // The same for this object and all below it.
@@ -118,6 +131,7 @@ private:
     void InvalidateRemasked();
     void InvalidateDrawn();
     SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);
+    void AddOwnEdges(CRaster* raster, RColor* clip);
     RColor* MaskColor() const;
     bool EdgesContain(const SPOINT* pt);
     bool FieldContains(const MATRIX* placed, const SPOINT* pt) const;

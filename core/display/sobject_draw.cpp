@@ -1,5 +1,6 @@
 // Drawing the object tree with its masks.
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 #include "core/player/limits.h"
 
 void SObject::Draw(CRaster* raster, STransform placed, RColor* clip)
@@ -9,11 +10,19 @@ void SObject::Draw(CRaster* raster, STransform placed, RColor* clip)
     placed.Concat(&xform);
     if (MayShowIn(raster->AreaDev())) {
         BuildEdges(&placed);
-        raster->AddEdges(edges, colors, clip);
+        AddOwnEdges(raster, clip);
         drawn = 1;
     }
     for (SObject* child = bottomChild; child;)
         child = child->DrawInOrder(raster, &placed, clip);
+}
+
+void SObject::AddOwnEdges(CRaster* raster, RColor* clip)
+{
+    if (editText)
+        editText->Draw(raster, clip);
+    else
+        raster->AddEdges(edges, colors, clip);
 }
 
 // Draws this object, and what it masks when it is a mask; returns the sibling to go on with.
@@ -44,7 +53,10 @@ SObject* SObject::DrawClipBracket(CRaster* raster, const STransform* parentXform
     while (next && next->depth <= clipDepth)
         next = next->DrawInOrder(raster, parentXform, mask);
     display->openMasks--;
-    raster->AddEdges(edges, colors, clip ? clip : ClipMarker());
+    if (editText)
+        editText->DrawMask(raster, clip);
+    else
+        raster->AddEdges(edges, colors, clip ? clip : ClipMarker());
     return next;
 }
 

@@ -175,6 +175,7 @@ void DisplayList::Empty(SObject* obj)
     obj->clipDepth = 0;
     obj->Modify();
     obj->FreeCache();
+    obj->FreeEditText();
     if (button == obj)
         button = nullptr;
     obj->character = ExchangeForGone(obj->character);

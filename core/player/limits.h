@@ -57,6 +57,10 @@ struct SLimits {
     // Of these, names that share a place in the index, which only chosen ones do. Further ones are
     // dropped.
     U32 variablesAlike = 32;
+    // Text fields alive in one display list, and the bytes of all their texts. Further fields show
+    // nothing, longer texts are cut.
+    U32 textFields = 4096;
+    U32 textFieldBytes = 4u << 20;
     // Bytes of a stream of variables; the rest is dropped.
     U32 variablesBytes = 4u << 20;
     // Tags that all timelines together execute in one tick, with whatever is charged like tags

@@ -378,7 +378,7 @@ private:
     bool BeginInput();
     void FinishButton(int updateScreen);
     void NotePointer(const SPOINT* pt, int mouseDown);
-    const char* FindValue(ScriptThread* thread, const char* path);
+    const char* FindValue(ScriptThread* thread, const char* path, char* digits);
     double ObjectProperty(SObject* obj, int index);
     void SetObjectProperty(SObject* obj, int index, double value);
     SPOINT DragPoint(const SPOINT* pt) const;

@@ -3,15 +3,42 @@
 
 #include <cstring>
 
+#include "core/player/numbers.h"
 #include "core/stream/str.h"
 
 namespace {
 
-// "field.scroll" and "field.maxscroll" mean a text field, and no name with a dot is ever that of a
-// plain variable. No text field scrolls yet: such names read as absent and are not written.
+// "field.scroll" and "field.maxscroll" mean the text fields that are bound to a variable, and no
+// name with a dot is ever that of a plain variable.
 bool IsFieldName(const char* name)
 {
     return std::strchr(name, '.') != nullptr;
+}
+
+// The scroll position that such a name means, read or set; false when there is none, or when a
+// script may not do that.
+bool ScrollField(const ScriptThread* thread, const char* name, bool set, S32* scroll)
+{
+    const char* dot = std::strchr(name, '.');
+    const bool most = StrEqual(dot, ".maxscroll");
+    if (!thread->display || (!most && !StrEqual(dot, ".scroll")) || (most && set))
+        return false;
+    char* field = CreateStr(name, static_cast<int>(dot - name));
+    const int what = set    ? SObject::kSetScroll
+                     : most ? SObject::kGetMaxScroll
+                            : SObject::kGetScroll;
+    const bool done = field && thread->display->root.ScrollEditText(thread, field, what, scroll);
+    FreeStr(field);
+    return done;
+}
+
+void SetScroll(const ScriptThread* thread, const char* name, const char* value)
+{
+    double number = 0;
+    if (!value || !ParseDouble(value, StrLength(value), &number))
+        return;
+    S32 scroll = TruncateToInt(number);
+    ScrollField(thread, name, true, &scroll);
 }
 
 bool IsFrameNumber(const char* text)
@@ -58,24 +85,33 @@ ScriptThread* SPlayer::ResolveFrameNum(const char* frameName, ScriptThread* thre
     return target;
 }
 
-const char* SPlayer::FindValue(ScriptThread* thread, const char* path)
+const char* SPlayer::FindValue(ScriptThread* thread, const char* path, char* digits)
 {
     const char* name;
+    S32 scroll;
     ScriptThread* target = ResolveVariable(path, thread, &name);
-    if (!target || IsFieldName(name))
+    if (!target)
         return nullptr;
+    if (IsFieldName(name)) {
+        if (!ScrollField(target, name, false, &scroll))
+            return nullptr;
+        FormatInteger(scroll, digits);
+        return digits;
+    }
     const SVariable* var = target->FindVariable(name);
     return var ? var->value : nullptr;
 }
 
 char* SPlayer::GetVariable(ScriptThread* thread, const char* path)
 {
-    return CreateStr(FindValue(thread, path));
+    char digits[kNumberChars];
+    return CreateStr(FindValue(thread, path, digits));
 }
 
 bool SPlayer::GetVariable(ScriptThread* thread, const char* path, ScriptValue* value)
 {
-    const char* text = FindValue(thread, path);
+    char digits[kNumberChars];
+    const char* text = FindValue(thread, path, digits);
     value->Clear();
     if (text)
         value->SetText(text, StrLength(text));
@@ -87,6 +123,8 @@ void SPlayer::SetVariable(ScriptThread* thread, const char* path, const char* va
 {
     const char* name;
     ScriptThread* target = ResolveVariable(path, thread, &name);
-    if (target && !IsFieldName(name))
+    if (target && IsFieldName(name))
+        SetScroll(target, name, value);
+    else if (target)
         target->SetVariable(name, value, updateFields);
 }

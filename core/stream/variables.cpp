@@ -67,7 +67,7 @@ SVariable* ScriptThread::FindVariable(const char* name)
     return var;
 }
 
-void ScriptThread::SetVariable(const char* name, const char* value, int)
+void ScriptThread::SetVariable(const char* name, const char* value, int flag)
 {
     SVariable* var = FindVariable(name);
     if (!var)
@@ -78,6 +78,8 @@ void ScriptThread::SetVariable(const char* name, const char* value, int)
     char* copy = CreateStr(value);
     FreeStr(var->value);
     var->value = copy;
+    if (display)
+        display->root.UpdateEditText(this, var->name, copy, flag);
 }
 
 // Appended to the list; null when a limit or memory forbids it.

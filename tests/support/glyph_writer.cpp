@@ -68,6 +68,23 @@ ByteWriter TextBody(U16 id, const Box& bounds, const Mat& mat, const std::vector
     return out.PutU8(0);
 }
 
+ByteWriter FieldBody(U16 id, const FieldText& field)
+{
+    ByteWriter out = ByteWriter().PutU16(id).PutRect(field.box).PutU16(field.flags);
+    if (field.flags & 0x0001)
+        out.PutU16(field.font).PutU16(field.height);
+    if (field.flags & 0x0004)
+        out.PutColor(field.color, true);
+    if (field.flags & 0x0002)
+        out.PutU16(field.maxLen);
+    if (field.flags & 0x2000) {
+        out.PutU8(U32(field.layout[0]));
+        out = PutNumbers(out, {field.layout.begin() + 1, field.layout.end()}, true);
+    }
+    out.PutString(field.variable);
+    return field.flags & 0x0080 ? out.PutString(field.text) : out;
+}
+
 ByteWriter MorphBody(U16 id, const ShapeBuilder& start, const ShapeBuilder& end)
 {
     ByteWriter out;

@@ -26,5 +26,16 @@ ByteWriter FontInfoBody(U16 id, const FontText& text);
 ByteWriter Font2Body(U16 id, const Glyphs& glyphs, const FontText& text);
 ByteWriter TextBody(U16 id, const Box& bounds, const Mat& mat, const std::vector<TextRun>& runs,
                     bool alpha = true); // code 33; 11 without alpha
+// A text field; what the flags do not announce is left out.
+struct FieldText {
+    Box box;
+    U32 flags = 0;
+    U16 font = 1, height = 400; // twips
+    Rgba color = {0, 0, 0, 255};
+    U16 maxLen = 0;
+    std::vector<S32> layout = {0, 0, 0, 0, 0}; // alignment, margins, indent, leading
+    std::string variable = "", text = "";
+};
+ByteWriter FieldBody(U16 id, const FieldText& field); // code 37
 // Code 46; see ShapeBuilder::WriteMorph.
 ByteWriter MorphBody(U16 id, const ShapeBuilder& start, const ShapeBuilder& end);

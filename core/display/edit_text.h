@@ -1,0 +1,91 @@
+// EditText: the text field of one display object.
+#pragma once
+
+#include "core/text/field_font.h"
+#include "core/text/field_record.h"
+#include "core/text/text_layout.h"
+
+class CRaster;
+class ScriptThread;
+struct RColor;
+struct REdge;
+struct SObject;
+struct STransform;
+
+// Text, its layout, what of it is selected, and how it is drawn. Made for an object that shows a
+// text field, and owned by it; made anew when another field takes its place. Reads the field's
+// record and outlines in the buffer of the movies that they are from, so it must be gone before the
+// field's movie is. All fields of a display list are linked there in the order they were made in.
+class EditText {
+public:
+    // The fields of one display list.
+    struct List {
+        EditText* first = nullptr;
+        EditText* last = nullptr;
+        U32 count = 0; // at most SLimits::textFields
+        U32 bytes = 0; // of all their texts, at most SLimits::textFieldBytes
+    };
+
+    // The field that `obj` shows, with its initial text. Null when memory or a limit forbids it;
+    // the object then shows nothing.
+    static EditText* Create(SObject* obj);
+    ~EditText();
+    EditText(const EditText&) = delete;
+    EditText& operator=(const EditText&) = delete;
+
+    const SFieldRecord& Record() const { return record; }
+    const char* Text() const { return layout.Text(); }
+    U32 Length() const { return layout.Length(); }
+    // Replaces the text as scripts do, whatever the field's greatest length: selection and
+    // scrolling stay as far as the new text allows.
+    void SetText(std::string_view text);
+    // Byte offsets; what lies between them is selected.
+    U32 Anchor() const { return anchor; }
+    U32 Caret() const { return caret; }
+
+    // --- the bound variable ---
+    // Takes the variable's text, or, if there is none, makes it from the initial text.
+    void UpdateFromVariable();
+    // The variable is that of a timeline.
+    bool IsBoundTo(const ScriptThread* thread, const char* name, U32 nameHash) const;
+
+    // --- scrolling, in lines from 1 ---
+    S32 Scroll() const { return layout.Scroll(); }
+    S32 MaxScroll() const { return layout.MaxScroll(); }
+    void SetScroll(S32 scroll); // clamped
+
+    // --- drawing ---
+    // Builds box, selection and the lines in view; glyphs go to the object's own edges.
+    void Build(const STransform* placed);
+    // Hands all to the raster, the text inside the field's bounds only.
+    void Draw(CRaster* raster, RColor* clip);
+    // The same for a field that is a mask: its glyphs.
+    void DrawMask(CRaster* raster, RColor* clip);
+    void FreeCache();
+
+    EditText* next = nullptr; // link of the list
+
+private:
+    friend class FieldPainter;
+
+    explicit EditText(SObject* object);
+    bool Prepare();
+    void Link();
+    void Unlink();
+    // The timeline of the bound variable and its name there; null when there is none.
+    ScriptThread* Bound(const char** name) const;
+
+    SObject* obj;
+    EditText* previous = nullptr;
+    SFieldRecord record;
+    FieldFont font;
+    TextLayout layout;
+    char* variable = nullptr; // path, owned; null: not bound
+    U32 nameHash = 0;         // of the name at the path's end
+    U32 anchor = 0;
+    U32 caret = 0;
+    REdge* backEdges = nullptr; // border, background and selection
+    RColor* backColors = nullptr;
+    REdge* maskEdges = nullptr; // the bounds, which the text stays in
+    RColor* maskColors = nullptr;
+};

@@ -1,0 +1,187 @@
+// Drawing text fields: box, selection, glyphs and caret.
+#include "core/display/edit_text.h"
+
+#include <algorithm>
+
+#include "core/display/display_list.h"
+#include "core/player/limits.h"
+#include "core/player/player.h"
+#include "core/shape/character_parser.h"
+#include "core/shape/stroker.h"
+
+namespace {
+constexpr U32 kGlyphCost = 8;       // records that setting up for an outline is worth
+constexpr S32 kScalePerHeight = 64; // of an em of 1024 units, in 16.16
+constexpr SRGB kBlack = {0, 0, 0, 255};
+constexpr SRGB kWhite = {255, 255, 255, 255};
+
+// How the colours of one list lie above one another.
+enum EFieldLayer : U32 { kFill = 1, kBorder, kBar, kGlyphs = 1, kChosen };
+} // namespace
+
+// Builds one field's edges once.
+class FieldPainter {
+public:
+    FieldPainter(EditText* editText, const STransform* transform)
+        : field(*editText), obj(editText->obj), display(obj->display), placed(transform),
+          from(std::min(field.anchor, field.caret)), to(std::max(field.anchor, field.caret))
+    {
+    }
+
+    void Paint();
+
+private:
+    bool InView(U32 line) const;
+    void PaintBox();
+    void PaintBars();
+    SRECT BarOf(U32 line) const;
+    void PaintLine(U32 line);
+    void PaintGlyph(const LineWalk& at, S32 baseline);
+    RColor* GlyphColor(bool chosen);
+    RColor* BackColor(SRGB value, U32 order)
+    {
+        return CreateSolidColor(display, &field.backColors, value, placed->cxform, order);
+    }
+
+    EditText& field;
+    SObject* obj;
+    DisplayList* display;
+    const STransform* placed;
+    U32 from; // of the selection
+    U32 to;
+    RColor* glyphColors[2] = {}; // plain, selected
+};
+
+// A mask has neither box nor selection.
+void FieldPainter::Paint()
+{
+    if (!obj->IsClip()) {
+        PaintBox();
+        PaintBars();
+    }
+    for (U32 line = field.layout.FirstLine(); InView(line) && display->recordsLeft > 0; line++)
+        PaintLine(line);
+    RColor* inside = CreateClipColor(display, &field.maskColors);
+    if (inside)
+        AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
+}
+
+bool FieldPainter::InView(U32 line) const
+{
+    return line < field.layout.LineCount() && field.layout.LineTop(line) < field.record.bounds.ymax;
+}
+
+void FieldPainter::PaintBox()
+{
+    if (!field.record.Has(kFieldBorder))
+        return;
+    RColor* fill = BackColor(kWhite, kFill);
+    RColor* line = fill ? BackColor(kBlack, kBorder) : nullptr;
+    if (!line)
+        return;
+    SStroker stroker(display, &field.backEdges);
+    stroker.BeginStroke(0, line);
+    AddRect(&field.record.bounds, &placed->mat, fill, display, &field.backEdges, &stroker);
+    stroker.EndStroke();
+}
+
+void FieldPainter::PaintBars()
+{
+    RColor* bar = from < to ? BackColor(kBlack, kBar) : nullptr;
+    for (U32 line = field.layout.FirstLine(); bar && InView(line); line++) {
+        const SRECT r = BarOf(line);
+        if (r.xmin < r.xmax && r.ymin < r.ymax)
+            AddRect(&r, &placed->mat, bar, display, &field.backEdges, nullptr);
+    }
+}
+
+// What is selected of a line; a selected break shows as a narrow space.
+SRECT FieldPainter::BarOf(U32 line) const
+{
+    const TextLayout& text = field.layout;
+    const STextLine& l = text.Line(line);
+    const SRECT& b = field.record.bounds;
+    if (from > l.end || to <= l.start)
+        return {};
+    const S32 beyond = l.hard && to > l.end ? field.font.Height() / 4 : 0;
+    SRECT r = {text.XOf(line, std::max(from, l.start)),
+               text.XOf(line, std::min(to, l.end)) + beyond, text.LineTop(line),
+               text.LineTop(line) + text.LineHeight()};
+    r.xmin = std::max(r.xmin, b.xmin), r.xmax = std::min(r.xmax, b.xmax);
+    r.ymin = std::max(r.ymin, b.ymin), r.ymax = std::min(r.ymax, b.ymax);
+    return r;
+}
+
+// An outline may reach beside its advance, but hardly by more than its height.
+void FieldPainter::PaintLine(U32 line)
+{
+    const S32 baseline = field.layout.Baseline(line), reach = field.font.Height();
+    const SRECT& bounds = field.record.bounds;
+    for (LineWalk at(field.layout, line); at.Next() && at.x <= S64(bounds.xmax) + reach;) {
+        if (at.code == 0 || at.x + at.advance < S64(bounds.xmin) - reach)
+            continue;
+        if (display->recordsLeft == 0)
+            return;
+        PaintGlyph(at, baseline);
+    }
+}
+
+void FieldPainter::PaintGlyph(const LineWalk& at, S32 baseline)
+{
+    const S32 glyph = field.font.Glyph(at.code);
+    const SBytes outline = glyph >= 0 ? field.font.Font().Glyph(U32(glyph)) : SBytes{};
+    RColor* color = outline.len > 0 ? GlyphColor(at.offset >= from && at.offset < to) : nullptr;
+    if (!color)
+        return;
+    display->recordsLeft -= std::min(display->recordsLeft, kGlyphCost);
+    const S32 scale = field.font.Height() * kScalePerHeight;
+    MATRIX mat = {scale, 0, 0, scale, S32(at.x), baseline};
+    MatrixConcat(&mat, &placed->mat, &mat);
+    SCharacterParser parser(obj, obj->character->player, outline.at, S32(outline.len), 0, &mat);
+    parser.SetOnlyFill(color);
+    parser.useWinding = true;
+    parser.BuildEdges(false, &obj->devBounds);
+}
+
+// Made when the first glyph needs it. A mask has one colour for all.
+RColor* FieldPainter::GlyphColor(bool chosen)
+{
+    chosen = chosen && !obj->IsClip();
+    RColor*& color = glyphColors[chosen];
+    if (color)
+        return color;
+    color = obj->IsClip()
+                ? CreateClipColor(display, &obj->colors)
+                : CreateSolidColor(display, &obj->colors, chosen ? kWhite : field.record.color,
+                                   placed->cxform, chosen ? kChosen : kGlyphs);
+    return color;
+}
+
+void EditText::Build(const STransform* placed)
+{
+    FieldPainter(this, placed).Paint();
+}
+
+// The text goes in before what it is clipped to, like everything under a mask.
+void EditText::Draw(CRaster* raster, RColor* clip)
+{
+    raster->AddEdges(backEdges, backColors, clip);
+    raster->AddEdges(obj->edges, obj->colors, maskColors);
+    raster->AddEdges(maskEdges, maskColors, clip ? clip : ClipMarker());
+}
+
+void EditText::DrawMask(CRaster* raster, RColor* clip)
+{
+    raster->AddEdges(obj->edges, obj->colors, maskColors);
+    raster->AddEdges(maskEdges, maskColors, clip ? clip : ClipMarker());
+}
+
+void EditText::FreeCache()
+{
+    obj->display->FreeEdges(backEdges);
+    obj->display->FreeEdges(maskEdges);
+    obj->display->FreeColors(backColors);
+    obj->display->FreeColors(maskColors);
+    backEdges = maskEdges = nullptr;
+    backColors = maskColors = nullptr;
+}

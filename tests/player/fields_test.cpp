@@ -1,0 +1,109 @@
+// Text fields in a movie: what they show, and the variables that they are bound to.
+#include "core/display/edit_text.h"
+#include "core/stream/str.h"
+#include "core/text/field_record.h"
+#include "tests/player/player_scene.h"
+#include "tests/support/glyph_writer.h"
+#include "tests/support/script_writer.h"
+
+namespace {
+
+constexpr U32 kUsual = kFieldFont | kFieldColor | kFieldOwnGlyphs | kFieldText;
+constexpr U32 kLines = kUsual | kFieldMultiline | kFieldWrap;
+
+// 200 x 200 pixels with font 1: "a" is a box half as wide as its advance of half the height, which
+// is 20 pixels; it stands on the baseline 16 pixels below the line's top.
+MovieWriter Begin()
+{
+    MovieWriter movie(4000, 4000, Fps(10));
+    ShapeBuilder box;
+    box.AddFill(Rgba{});
+    box.Fill1(1).Rect(0, -512, 256, 0);
+    const FontText text = {"Boxes", 0x80, {'a', ' '}, {819, 205, 0, 512, 512}};
+    return movie.Raw(kTagDefineFont2, Font2Body(1, {box, ShapeBuilder()}, text)), movie;
+}
+
+struct Stage : PlayingShell {
+    explicit Stage(TagWriter& movie)
+        : PlayingShell((movie.Show(4).End(), static_cast<MovieWriter&>(movie).Bytes()))
+    {
+    }
+    EditText* Field(U16 depth) { return scene.FindChild(rootObject, depth)->editText; }
+    std::string Text(U16 depth) { return Field(depth)->Text(); }
+    std::string Value(const char* path)
+    {
+        char* text = GetVariable(this, path);
+        const std::string copy = text ? text : "none";
+        FreeStr(text);
+        return copy;
+    }
+    void Set(const char* path, const char* value) { SPlayer::SetVariable(this, path, value, 1); }
+};
+
+TEST(Fields, DrawWhatStaticTextDraws)
+{
+    const Mat turned = Mat::Rotate(30).Then(Mat::Scale(1.5)).ThenTranslate(1400, 700);
+    const Cx faded = Cx::Multiply(256, 128, 256, 200);
+    MovieWriter field = Begin(), fixed = Begin();
+    const Rgba blue = {20, 40, 220, 255};
+    field.Raw(
+        kTagDefineEditText,
+        FieldBody(
+            2, {.box = {0, 1500, 0, 1000}, .flags = kLines, .color = blue, .text = "aaa a\raa"}));
+    const TextRun first = {{{1, 400}}, blue, 40, 40 + 320, {{0, 200}, {0, 200}, {0, 400}, {0, 0}}};
+    const TextRun second = {{{1, 400}}, blue, 40, 40 + 720, {{0, 200}, {0, 0}}};
+    fixed.Raw(kTagDefineText2, TextBody(2, {0, 1500, 0, 1000}, {}, {first, second}));
+    Stage a(field.Place(2, 1, turned, faded)), b(fixed.Place(2, 1, turned, faded));
+    EXPECT_EQ("", ExpectSame(Shot(&a), Shot(&b), "field-static"));
+}
+
+// Text that is too wide, too high or scrolled never leaves the box; the mask itself paints nothing.
+TEST(Fields, StayInTheirBoxAndScroll)
+{
+    MovieWriter movie = Begin();
+    const std::string lines = "aaaaaaaaaaaaaaaaaa\r \raaaaaaaaaaaa\ra\ra";
+    movie.Raw(kTagDefineEditText, FieldBody(2, {.box = {0, 1000, 0, 900},
+                                                .flags = kUsual | kFieldMultiline,
+                                                .variable = "v",
+                                                .text = lines}));
+    Stage s(movie.Place(2, 1, Mat::Translate(1000, 1000)));
+    const auto dark = [&](int x, int y) { return U8(Shot(&s).At(x, y)) < 128; };
+    EXPECT_TRUE(dark(54, 64) && dark(94, 64) && !dark(101, 64) && !dark(104, 64) && !dark(54, 84));
+    EXPECT_EQ("1 4", s.Value("v.scroll") + " " + s.Value("V.maxscroll"));
+    s.Set("v.scroll", "3.9");
+    EXPECT_TRUE(dark(54, 64) && dark(94, 64) && dark(54, 84) && !dark(74, 84) && !dark(54, 104));
+    for (const auto& [name, value, scroll] : {std::array{"v.scroll", "99", "4"},
+                                              {"v.scroll", "x", "4"},
+                                              {"v.maxscroll", "1", "4"},
+                                              {"v.scroll", "-5", "1"}})
+        EXPECT_EQ(scroll, (s.Set(name, value), s.Value("v.scroll"))) << name << value;
+    EXPECT_EQ("none none", s.Value("w.scroll") + " " + s.Value("v.other"));
+}
+
+TEST(Fields, ShowTheirVariables)
+{
+    MovieWriter movie = Begin(), sprite;
+    const Box box = {0, 2000, 0, 500};
+    movie.Raw(kTagDefineEditText,
+              FieldBody(2, {.box = box, .flags = kUsual, .variable = "v", .text = "first"}));
+    movie.Raw(kTagDefineEditText, FieldBody(3, {.box = box, .variable = "/s:w"}));
+    movie.DoAction(AssembleScript("\"v\" \"second\" SetVariable")).Place(2, 1).Place(3, 2);
+    movie.DefineSprite(4, sprite.Show().End()).Place2(3, {.character = 4, .name = "s"}).Show();
+    movie.Place(3, 4).Move(1, Mat::Translate(20, 20));
+    movie.Place2(2, {.move = true, .character = 2});
+    Stage s(movie);
+    EXPECT_EQ("second", s.Text(1));
+    s.Set("/s:W", "there");
+    EXPECT_EQ("there none", s.Text(2) + " " + s.Value("w"));
+    s.Tick();
+    EXPECT_EQ("second second there", s.Text(1) + " " + s.Text(2) + " " + s.Text(4));
+    s.GotoFrame(0);
+    EXPECT_EQ("second there", s.Text(1) + " " + s.Text(2));
+    s.Set("v", std::string(70000, 'x').c_str());
+    EXPECT_EQ(65535u, s.Field(1)->Length());
+    s.scene.RemoveObject(s.rootObject, 3);
+    s.Set("/s:w", "gone");
+    EXPECT_EQ("there", s.Text(2));
+}
+
+} // namespace
