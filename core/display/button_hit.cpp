@@ -16,16 +16,6 @@ SCharacter* HitArea(const SCharacter* button, const SButtonRecord& record)
     return hasShape ? ch : nullptr;
 }
 
-// The object's own coordinates to the device's, rounded as CalcUpdate rounds them.
-void DeviceMatrix(const SObject* obj, MATRIX* mat)
-{
-    if (obj->parent)
-        DeviceMatrix(obj->parent, mat);
-    else
-        *mat = obj->display->camera;
-    MatrixConcat(&obj->xform.mat, mat, mat);
-}
-
 // Walks the records of a button while the budget lasts.
 bool NextWithin(U32* budget, ButtonRecords* records, SButtonRecord* record)
 {
@@ -35,6 +25,15 @@ bool NextWithin(U32* budget, ButtonRecords* records, SButtonRecord* record)
     return records->Next(record);
 }
 } // namespace
+
+void GetDeviceMatrix(const SObject* obj, MATRIX* mat)
+{
+    if (obj->parent)
+        GetDeviceMatrix(obj->parent, mat);
+    else
+        *mat = obj->display->camera;
+    MatrixConcat(&obj->xform.mat, mat, mat);
+}
 
 void SObject::HitButton(SObject*& hit, STransform placed, const SPOINT* pt)
 {
@@ -93,7 +92,7 @@ void SObject::CalcButtonBounds(SRECT* r, U32* budget)
     if (!character || character->type != kCharButton)
         return;
     MATRIX toDevice;
-    DeviceMatrix(this, &toDevice);
+    GetDeviceMatrix(this, &toDevice);
     U32 all = gLimits.buttonRecords;
     ButtonRecords records(character);
     SButtonRecord record;

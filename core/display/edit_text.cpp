@@ -98,6 +98,7 @@ void EditText::SetText(std::string_view text)
     obj->display->work += Length() / kBytesPerUnit;
     anchor = std::min(anchor, Length());
     caret = std::min(caret, Length());
+    goal = TextLayout::kNoGoal;
 }
 
 ScriptThread* EditText::Bound(const char** name) const

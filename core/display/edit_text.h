@@ -42,10 +42,31 @@ public:
     // Byte offsets; what lies between them is selected.
     U32 Anchor() const { return anchor; }
     U32 Caret() const { return caret; }
+    bool HasSelection() const { return anchor != caret; }
+    U32 SelectionStart() const { return anchor < caret ? anchor : caret; }
+    U32 SelectionEnd() const { return anchor < caret ? caret : anchor; }
+
+    // --- keyboard, mouse and clipboard; the bound variable is left to the caller ---
+    // False when the field has no use for the key. Codes and modifiers as in SPlayer.
+    bool HandleKeyDown(int key, int modifiers);
+    // `pt` in twips of the field: a press, the moves after it, and with `down` off the release.
+    void Mouse(const SPOINT& pt, bool down);
+    bool Selecting() const { return selecting; } // between these two
+    // Scrolls the caret, which is at `to`, into view.
+    void Select(U32 from, U32 to);
+    // In place of what is selected, as much as the greatest length allows. Nothing where nothing
+    // may be typed.
+    void Insert(std::string_view s);
+    void DeleteSelection() { HasSelection() && MayType() ? ReplaceSelection("") : void(); }
+    bool MayType() const { return !record.Has(kFieldReadOnly); }
+    // Nothing is selected any more.
+    void LoseFocus();
 
     // --- the bound variable ---
     // Takes the variable's text, or, if there is none, makes it from the initial text.
     void UpdateFromVariable();
+    // The timeline of the bound variable and its name there; null when there is none now.
+    ScriptThread* Bound(const char** name) const;
     // The variable is that of a timeline.
     bool IsBoundTo(const ScriptThread* thread, const char* name, U32 nameHash) const;
 
@@ -72,8 +93,9 @@ private:
     bool Prepare();
     void Link();
     void Unlink();
-    // The timeline of the bound variable and its name there; null when there is none.
-    ScriptThread* Bound(const char** name) const;
+    void MoveCaret(ECaretMove move, bool extend);
+    void DeleteBy(ECaretMove move);
+    void ReplaceSelection(std::string_view s);
 
     SObject* obj;
     EditText* previous = nullptr;
@@ -84,7 +106,9 @@ private:
     U32 nameHash = 0;         // of the name at the path's end
     U32 anchor = 0;
     U32 caret = 0;
-    REdge* backEdges = nullptr; // border, background and selection
+    S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move
+    bool selecting = false;         // the mouse is down in it
+    REdge* backEdges = nullptr;     // border, background and selection
     RColor* backColors = nullptr;
     REdge* maskEdges = nullptr; // the bounds, which the text stays in
     RColor* maskColors = nullptr;

@@ -16,7 +16,7 @@ constexpr SRGB kBlack = {0, 0, 0, 255};
 constexpr SRGB kWhite = {255, 255, 255, 255};
 
 // How the colours of one list lie above one another.
-enum EFieldLayer : U32 { kFill = 1, kBorder, kBar, kGlyphs = 1, kChosen };
+enum EFieldLayer : U32 { kFill = 1, kBorder, kBar, kGlyphs = 1, kChosen, kCaret };
 } // namespace
 
 // Builds one field's edges once.
@@ -37,6 +37,7 @@ private:
     SRECT BarOf(U32 line) const;
     void PaintLine(U32 line);
     void PaintGlyph(const LineWalk& at, S32 baseline);
+    void PaintCaret();
     RColor* GlyphColor(bool chosen);
     RColor* BackColor(SRGB value, U32 order)
     {
@@ -61,6 +62,9 @@ void FieldPainter::Paint()
     }
     for (U32 line = field.layout.FirstLine(); InView(line) && display->recordsLeft > 0; line++)
         PaintLine(line);
+    const SPlayer* player = display->splayer;
+    if (!obj->IsClip() && player && player->focusText.Get() == obj && field.MayType() && from == to)
+        PaintCaret();
     RColor* inside = CreateClipColor(display, &field.maskColors);
     if (inside)
         AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
@@ -155,6 +159,25 @@ RColor* FieldPainter::GlyphColor(bool chosen)
                 : CreateSolidColor(display, &obj->colors, chosen ? kWhite : field.record.color,
                                    placed->cxform, chosen ? kChosen : kGlyphs);
     return color;
+}
+
+// As thin as can be, whatever the scale.
+void FieldPainter::PaintCaret()
+{
+    RColor* color =
+        CreateSolidColor(display, &obj->colors, field.record.color, placed->cxform, kCaret);
+    if (!color)
+        return;
+    const U32 line = field.layout.LineOf(to);
+    const S32 top = field.layout.LineTop(line);
+    SPOINT ends[2] = {{field.layout.XOf(line, to), top}, {0, top + field.layout.LineHeight()}};
+    ends[1].x = ends[0].x;
+    for (SPOINT& p : ends)
+        MatrixTransformPoint(&placed->mat, &p, &p);
+    SStroker stroker(display, &obj->edges);
+    stroker.BeginStroke(0, color);
+    AddRectEdge(&ends[0], &ends[1], nullptr, display, &obj->edges, &stroker);
+    stroker.EndStroke();
 }
 
 void EditText::Build(const STransform* placed)

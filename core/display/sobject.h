@@ -101,6 +101,9 @@ struct SObject {
     // timeline: they show its new value. With flag 0 the one that has the keyboard focus does not.
     void UpdateEditText(const ScriptThread* timeline, const char* varName, const char* value,
                         int flag);
+    // The pointer at `pt` (device units) presses, or drags, in this object's text field; or lets
+    // go.
+    void EditTextMouse(const SPOINT* pt, int down);
     enum EScroll { kGetScroll, kGetMaxScroll, kSetScroll };
     // Reads a scroll position of the first of these fields, or sets those of all; false when there
     // is none.
@@ -141,6 +144,9 @@ private:
     SObject* FirstBeyond(U16 maskDepth) const;
     void LeaveTimeline();
 };
+
+// The object's own coordinates to the device's, rounded as CalcUpdate rounds them.
+void GetDeviceMatrix(const SObject* obj, MATRIX* mat);
 
 // Union of the character's bounds and those of all children, in the coordinates of the object's
 // parent, or through `mat` as well. Morphs count with their start bounds.

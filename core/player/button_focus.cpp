@@ -41,7 +41,7 @@ void SPlayer::ButtonFocusSet(SObject* obj)
         ButtonFocusRemove();
         return;
     }
-    focusText.Set(nullptr);
+    SetFocusText(nullptr);
     buttonFocus.object.Set(obj);
     obj->CalcButtonBounds(&buttonFocus.bounds);
     ShowFocus(&buttonFocus.bounds);

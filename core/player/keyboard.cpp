@@ -15,13 +15,6 @@ enum Key {
 };
 constexpr int kShift = 0x01;
 
-// What a text field with the focus makes of a key. There are no fields that can be edited yet:
-// focusText is never set.
-int GiveKeyToText(SPlayer*, int, int)
-{
-    return 0;
-}
-
 void CopyFocus(const SButton& from, SButton* to)
 {
     to->object.Set(from.object.Get());
@@ -118,7 +111,7 @@ int SPlayer::HandleKeyDown(int key, int modifiers)
         UpdateScreen();
         return 1;
     }
-    return GiveKeyToText(this, key, modifiers);
+    return TextKeyDown(key, modifiers);
 }
 
 // No key does anything when it is let go.

@@ -58,12 +58,6 @@ void SPlayer::GetPopupMenuState(MenuStatus* status)
     GetMenuState(status);
 }
 
-// No text field can be edited yet.
-void SPlayer::GetEditMenuState(MenuStatus* status)
-{
-    *status = {};
-}
-
 void SPlayer::SetMenuState(const MenuStatus& mask)
 {
     menuMask = mask;

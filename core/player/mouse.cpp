@@ -1,4 +1,5 @@
 // The mouse: from the shell's events to buttons, drags and panning.
+#include "core/display/edit_text.h"
 #include "core/player/player.h"
 
 namespace {
@@ -6,23 +7,6 @@ namespace {
 bool IsTextField(const SObject* obj)
 {
     return obj != nullptr && obj->character->type == kCharEditText;
-}
-
-// Whether a press that began in a text field selects there. No field can be edited yet: focusText
-// is never set, and the pointer at a field only changes its shape.
-bool SelectsText(const SPlayer&)
-{
-    return false;
-}
-
-// The pointer during such a selection, until `mouseDown` is off.
-void DragSelection(SPlayer&, const SPOINT*, int) {}
-
-// Keeps text fields from the buttons' business: returns what is under the pointer for them.
-SObject* PointAtText(SPlayer* player, SObject* hit)
-{
-    player->scene.textUnderMouse = IsTextField(hit);
-    return IsTextField(hit) ? nullptr : hit;
 }
 
 // The tracked button goes idle; a pressed one is dragged off before it is released outside.
@@ -39,6 +23,39 @@ S32 DeviceUnits(S32 pixels, int antialias)
 
 } // namespace
 
+// A press that began in a text field selects there until it ends.
+bool SPlayer::SelectsText() const
+{
+    const SObject* obj = focusText.Get();
+    return obj != nullptr && obj->editText != nullptr && obj->editText->Selecting();
+}
+
+void SPlayer::DragSelection(const SPOINT* pt, int mouseDown)
+{
+    const SPOINT dev = {DeviceUnits(pt->x, scene.antialias), DeviceUnits(pt->y, scene.antialias)};
+    focusText.Get()->EditTextMouse(&dev, mouseDown);
+    if (!mouseDown)
+        NotePointer(pt, 0);
+    UpdateScreen();
+}
+
+// Keeps text fields from the buttons' business: returns what is under the pointer for them. A press
+// moves the keyboard focus.
+SObject* SPlayer::PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, bool* changed)
+{
+    const SObject* focused = focusText.Get();
+    scene.textUnderMouse = IsTextField(hit);
+    if (IsTextField(hit) && mouseDown && !SelectsText()) {
+        SetFocusText(hit);
+        DragSelection(pt, 1);
+    } else if (!IsTextField(hit) && mouseDown && focused != nullptr &&
+               (!focused->editText || !focused->editText->Record().Has(kFieldKeepFocus))) {
+        SetFocusText(nullptr);
+    }
+    *changed = focused != focusText.Get();
+    return IsTextField(hit) ? nullptr : hit;
+}
+
 // Every event has its own share of work, for its actions may go to other frames.
 bool SPlayer::BeginInput()
 {
@@ -54,7 +71,7 @@ void SPlayer::MouseDown(S32 x, S32 y)
         return;
     const SPOINT pt = {x, y};
     DoButton(&pt, 1, 1);
-    if (!loaded || scene.button != nullptr || SelectsText(*this) || !IsZoomed())
+    if (!loaded || scene.button != nullptr || SelectsText() || !IsZoomed())
         return;
     panning = 1;
     panStart = pt;
@@ -67,8 +84,8 @@ void SPlayer::MouseMove(S32 x, S32 y, int buttonDown)
     const SPOINT pt = {x, y};
     if (drag.object)
         UpdateDragObject(&pt);
-    if (SelectsText(*this))
-        DragSelection(*this, &pt, 1);
+    if (SelectsText())
+        DragSelection(&pt, 1);
     else if (panning)
         PanTo(&pt);
     else
@@ -81,8 +98,8 @@ void SPlayer::MouseUp(S32 x, S32 y)
     if (!BeginInput())
         return;
     const SPOINT pt = {x, y};
-    if (SelectsText(*this))
-        DragSelection(*this, &pt, 0);
+    if (SelectsText())
+        DragSelection(&pt, 0);
     else if (panning)
         panning = 0;
     else
@@ -122,7 +139,7 @@ void SPlayer::PanTo(const SPOINT* pt)
 bool SPlayer::MouseIsHeld() const
 {
     const bool pressed = scene.button != nullptr && scene.buttonState >= 3;
-    return drag.object || panning || SelectsText(*this) || pressed;
+    return drag.object || panning || SelectsText() || pressed;
 }
 
 // Buttons that move under a pointer at rest change their state.
@@ -137,10 +154,13 @@ void SPlayer::RetestButtons()
 // What a button makes of the pointer hides the keyboard's highlight, even in a tick.
 void SPlayer::DoButton(const SPOINT* pt, int mouseDown, int updateScreen)
 {
-    SObject* hit = PointAtText(this, scene.HitButton(pt));
+    bool changed = false;
+    SObject* hit = PointAtText(scene.HitButton(pt), pt, mouseDown, &changed);
     if (scene.SetButton(hit, mouseDown)) {
         HideFocus();
         FinishButton(updateScreen);
+    } else if (changed && updateScreen) {
+        UpdateScreen();
     }
     if (loaded)
         NotePointer(pt, mouseDown);

@@ -225,6 +225,15 @@ public:
     int NumButtons() const;
     void AddButton(SObject* obj, const SRECT* bounds);
     void RemoveAllButtons();
+    // Gives the keyboard focus to a text field, or takes it from the one that has it. The field
+    // that had it loses its selection.
+    void SetFocusText(SObject* obj);
+    // In the text field that has it: 0 selects all, 1 deletes what is selected.
+    void EditCommand(int command);
+    // What is selected there, freed with FreeStr; null when that is nothing or a password.
+    void EditCopy(char** text);
+    // Puts a text, as bytes of Latin-1, in place of what is selected there.
+    void EditPaste(const char* text);
     // An object is about to be removed: lets go of it wherever that is seen.
     void BeforeRemoval(SObject* obj);
 
@@ -376,6 +385,11 @@ private:
     void FreeLoader(ScriptPlayer* loader);
     void LinkStream(StreamData* stream, ScriptPlayer* receiver);
     bool BeginInput();
+    SObject* PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, bool* changed);
+    bool SelectsText() const;
+    void DragSelection(const SPOINT* pt, int mouseDown);
+    int TextKeyDown(int key, int modifiers);
+    void FinishEdit();
     void FinishButton(int updateScreen);
     void NotePointer(const SPOINT* pt, int mouseDown);
     const char* FindValue(ScriptThread* thread, const char* path, char* digits);

@@ -1,5 +1,6 @@
 // The state of a player as one JSON object.
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 #include "tools/vexel/json_writer.h"
 #include "tools/vexel/player_state.h"
 #include "tools/vexel/text_form.h"
@@ -17,6 +18,7 @@ private:
     void AddPlace(const StateNode& node);
     void AddBounds(const StateNode& node);
     void AddOwn(const StateNode& node);
+    void AddField(const EditText& field);
     void AddTimeline(const ScriptThread& timeline);
     void AddRequests();
     void StringOrNull(const char* text) { text != nullptr ? json.String(text) : json.Null(); }
@@ -78,6 +80,13 @@ void StateWriter::AddTimeline(const ScriptThread& timeline)
     json.EndObject();
 }
 
+void StateWriter::AddField(const EditText& field)
+{
+    json.Key("text").String(field.Text());
+    json.Key("scroll").Int(field.Scroll()).Key("maxscroll").Int(field.MaxScroll());
+    json.Key("selection").BeginArray().Int(S32(field.Anchor())).Int(S32(field.Caret())).EndArray();
+}
+
 // What only some kinds of nodes have.
 void StateWriter::AddOwn(const StateNode& node)
 {
@@ -85,6 +94,8 @@ void StateWriter::AddOwn(const StateNode& node)
         json.Key("level").Int(node.level).Key("url").String(LevelUrl(node));
     if (node.IsButton())
         json.Key("state").String(node.ButtonState());
+    if (node.object != nullptr && node.object->editText != nullptr)
+        AddField(*node.object->editText);
     if (node.timeline != nullptr)
         AddTimeline(*node.timeline);
 }

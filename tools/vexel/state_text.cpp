@@ -1,5 +1,6 @@
 // The state of a player in lines for people.
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 #include "tools/vexel/message.h"
 #include "tools/vexel/player_state.h"
 #include "tools/vexel/text_form.h"
@@ -39,6 +40,13 @@ std::string PlaceText(const SObject& object)
     return object.visible ? text : text + " hidden";
 }
 
+std::string FieldState(const EditText& field)
+{
+    return " text=" + Quote(field.Text()) +
+           Format(" scroll=%d/%d selection=%u,%u", field.Scroll(), field.MaxScroll(),
+                  field.Anchor(), field.Caret());
+}
+
 std::string NodeTitle(const StateNode& node)
 {
     const char* type = node.Type();
@@ -59,6 +67,8 @@ void AddNode(const StateNode& node, size_t indent, int units, std::string* text)
         *text += " " + FrameText(*node.timeline);
     if (node.IsButton())
         (*text += " state=") += node.ButtonState();
+    if (node.object != nullptr && node.object->editText != nullptr)
+        *text += FieldState(*node.object->editText);
     if (node.object != nullptr)
         *text += PlaceText(*node.object) + BoundsText(node.Bounds(units));
     *text += '\n';
