@@ -61,6 +61,10 @@ public:
     bool MayType() const { return !record.Has(kFieldReadOnly); }
     // Nothing is selected any more.
     void LoseFocus();
+    // There is one to be seen, now or when it has blinked.
+    bool ShowsCaret() const;
+    // Hides the caret, or shows it again; whatever moves it shows it too.
+    void BlinkCaret();
 
     // --- the bound variable ---
     // Takes the variable's text, or, if there is none, makes it from the initial text.
@@ -108,6 +112,7 @@ private:
     U32 caret = 0;
     S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move
     bool selecting = false;         // the mouse is down in it
+    bool caretOn = true;            // blinks
     REdge* backEdges = nullptr;     // border, background and selection
     RColor* backColors = nullptr;
     REdge* maskEdges = nullptr; // the bounds, which the text stays in

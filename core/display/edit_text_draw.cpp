@@ -62,8 +62,7 @@ void FieldPainter::Paint()
     }
     for (U32 line = field.layout.FirstLine(); InView(line) && display->recordsLeft > 0; line++)
         PaintLine(line);
-    const SPlayer* player = display->splayer;
-    if (!obj->IsClip() && player && player->focusText.Get() == obj && field.MayType() && from == to)
+    if (field.caretOn && field.ShowsCaret())
         PaintCaret();
     RColor* inside = CreateClipColor(display, &field.maskColors);
     if (inside)

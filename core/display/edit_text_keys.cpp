@@ -4,6 +4,7 @@
 #include "core/display/display_list.h"
 #include "core/display/edit_text.h"
 #include "core/player/limits.h"
+#include "core/player/player.h"
 
 namespace {
 constexpr int kShift = 0x01;
@@ -116,6 +117,7 @@ void EditText::Select(U32 from, U32 to)
     anchor = std::min(from, Length());
     caret = std::min(to, Length());
     goal = TextLayout::kNoGoal;
+    caretOn = true;
     layout.Show(caret);
 }
 
@@ -123,7 +125,21 @@ void EditText::LoseFocus()
 {
     obj->Modify();
     selecting = false;
+    caretOn = true;
     anchor = caret;
+}
+
+bool EditText::ShowsCaret() const
+{
+    const SPlayer* player = obj->display->splayer;
+    const bool focused = player && player->focusText.Get() == obj;
+    return focused && MayType() && !HasSelection() && !obj->IsClip();
+}
+
+void EditText::BlinkCaret()
+{
+    obj->Modify();
+    caretOn = !caretOn;
 }
 
 // `pt` in the field's own space.

@@ -118,6 +118,16 @@ void SPlayer::EditPaste(const char* text)
     FinishEdit();
 }
 
+void SPlayer::CursorTick()
+{
+    UpdateCursor();
+    EditText* field = Focused(*this);
+    if (field == nullptr || !field->ShowsCaret() || !BeginInput())
+        return;
+    field->BlinkCaret();
+    CheckUpdate();
+}
+
 void SPlayer::GetEditMenuState(MenuStatus* status)
 {
     *status = {};

@@ -99,7 +99,7 @@ public:
 
     // --- what the shell supplies ---
     // Starts calling DoPlay(1) every `interval` ms (0: as often as every millisecond) and
-    // UpdateCursor every `cursorInterval` ms, never nested in another player call. False when no
+    // CursorTick every `cursorInterval` ms, never nested in another player call. False when no
     // timer can be had: the player is not `running` then and stands still, until Run is called
     // again or the shell ticks it by itself; a frame is due at once.
     virtual bool StartTimer(S32 interval, S32 cursorInterval) = 0;
@@ -234,6 +234,9 @@ public:
     void EditCopy(char** text);
     // Puts a text, as bytes of Latin-1, in place of what is selected there.
     void EditPaste(const char* text);
+    // Asks the shell for the pointer's shape anew and has the caret blink. A shell that never calls
+    // it shows the caret all the time.
+    void CursorTick();
     // An object is about to be removed: lets go of it wherever that is seen.
     void BeforeRemoval(SObject* obj);
 

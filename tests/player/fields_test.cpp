@@ -69,4 +69,20 @@ TEST(Fields, ShowTheirVariables)
     EXPECT_EQ("there", s.Text(2));
 }
 
+TEST(Fields, BlinkWhereTypingGoes)
+{
+    MovieWriter movie = Begin();
+    movie.Raw(kTagDefineEditText, FieldBody(2, {.box = {0, 2000, 0, 500}, .flags = kUsual}));
+    Stage s(movie.Place(2, 1));
+    const auto caret = [&] { return U8(Shot(&s).At(2, 10)) < 255; };
+    EXPECT_FALSE((s.CursorTick(), caret()));
+    s.MouseDown(50, 10);
+    EXPECT_TRUE(caret() && (s.CursorTick(), !caret()) && (s.CursorTick(), caret()));
+    s.CursorTick();
+    s.HandleKeyDown(3, 0);
+    EXPECT_TRUE(caret());
+    s.MouseDown(50, 100);
+    EXPECT_FALSE(caret() || (s.CursorTick(), caret()));
+}
+
 } // namespace
