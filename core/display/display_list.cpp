@@ -195,17 +195,22 @@ void DisplayList::ChargeTags(U32 tags)
 }
 
 // Allows a hit test its budgets. `pt` in device units, however far away it is.
-SPOINT DisplayList::BeginHitTest(const SPOINT* pt)
+void DisplayList::BeginHitTest()
 {
     recordsLeft = gLimits.shapeRecords;
     pixelsLeft = gLimits.decodedPixels;
+}
+
+SPOINT DisplayList::ToDevice(const SPOINT& pixels) const
+{
     const S64 scale = antialias ? 4 : 1;
-    return {Saturate32(pt->x * scale), Saturate32(pt->y * scale)};
+    return {Saturate32(pixels.x * scale), Saturate32(pixels.y * scale)};
 }
 
 SObject* DisplayList::HitTest(const SPOINT* pt)
 {
-    const SPOINT device = BeginHitTest(pt);
+    const SPOINT device = ToDevice(*pt);
+    BeginHitTest();
     SObject* hit = nullptr;
     root.HitTest(hit, {camera, cameraCxform}, &device);
     work += gLimits.shapeRecords - recordsLeft;
@@ -214,7 +219,8 @@ SObject* DisplayList::HitTest(const SPOINT* pt)
 
 SObject* DisplayList::HitButton(const SPOINT* pt)
 {
-    const SPOINT device = BeginHitTest(pt);
+    const SPOINT device = ToDevice(*pt);
+    BeginHitTest();
     SObject* hit = nullptr;
     if (RectPointIn(&devViewRect, &device))
         root.HitButton(hit, {camera, cameraCxform}, &device);

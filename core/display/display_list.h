@@ -169,6 +169,8 @@ public:
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
+    // Pixels in device coordinates, as far as those reach.
+    SPOINT ToDevice(const SPOINT& pixels) const;
     // The topmost object of any kind under `pt` (pixels), or null. Objects lie where the last
     // update saw them.
     SObject* HitTest(const SPOINT* pt);
@@ -233,7 +235,7 @@ private:
     void QueueClick(const SObject* obj);
     void StartButtonSound(SObject* obj, int slot);
     void ChargeTags(U32 tags);
-    SPOINT BeginHitTest(const SPOINT* pt);
+    void BeginHitTest();
     void UnlinkThread(ScriptThread* thread);
     void DropActions(ScriptThread* thread);
     void ClearRefs(const SObject* obj);

@@ -16,11 +16,6 @@ bool LetGoOfButton(DisplayList* scene)
     return (scene->button != nullptr && scene->SetButton(nullptr, 0)) || handled;
 }
 
-S32 DeviceUnits(S32 pixels, int antialias)
-{
-    return Saturate32(static_cast<S64>(pixels) * (antialias ? 4 : 1));
-}
-
 } // namespace
 
 // A press that began in a text field selects there until it ends.
@@ -32,7 +27,7 @@ bool SPlayer::SelectsText() const
 
 void SPlayer::DragSelection(const SPOINT* pt, int mouseDown)
 {
-    const SPOINT dev = {DeviceUnits(pt->x, scene.antialias), DeviceUnits(pt->y, scene.antialias)};
+    const SPOINT dev = scene.ToDevice(*pt);
     focusText.Get()->EditTextMouse(&dev, mouseDown);
     if (!mouseDown)
         NotePointer(pt, 0);
@@ -182,7 +177,7 @@ void SPlayer::FinishButton(int updateScreen)
 
 void SPlayer::NotePointer(const SPOINT* pt, int mouseDown)
 {
-    const SPOINT dev = {DeviceUnits(pt->x, scene.antialias), DeviceUnits(pt->y, scene.antialias)};
+    const SPOINT dev = scene.ToDevice(*pt);
     if (!RectPointIn(&scene.devViewRect, &dev)) {
         mouseState = -1;
         return;
