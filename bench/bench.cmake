@@ -20,4 +20,7 @@ if(benchmark_FOUND)
   add_executable(vexel_script_bench bench/script_bench.cpp)
   target_link_libraries(vexel_script_bench PRIVATE vexel_headless vexel_support
     benchmark::benchmark)
+  add_executable(vexel_field_bench bench/field_bench.cpp)
+  target_link_libraries(vexel_field_bench PRIVATE vexel_headless vexel_support
+    benchmark::benchmark)
 endif()
