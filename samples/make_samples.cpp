@@ -43,6 +43,7 @@ int main(int argc, char** argv)
         {"metamorphosis.vxm", MakeMetamorphosis()},
         {"orchard.vxm", MakeOrchard()},
         {"orchard_end.vxm", MakeOrchardEnd()},
+        {"form.vxm", MakeForm()},
         {"album.vxm", MakeAlbum(Load(folder + "album.vxm"))},
     };
     for (const auto& movie : movies) {

@@ -118,6 +118,7 @@ std::vector<U8> MakeGallery();
 std::vector<U8> MakeMetamorphosis();
 std::vector<U8> MakeOrchard();
 std::vector<U8> MakeOrchardEnd(); // which the orchard loads
+std::vector<U8> MakeForm();
 // Takes the packed images out of the movie as it was written before, when there is one: packing
 // libraries need not give the same bytes everywhere.
 std::vector<U8> MakeAlbum(const std::vector<U8>& earlier);

@@ -33,7 +33,8 @@ TEST(Samples, AreWhatIsCommittedAndRepaintAlike)
                    {"metamorphosis", MakeMetamorphosis(), 96},
                    {"album", MakeAlbum(Committed("album")), 120},
                    {"orchard", MakeOrchard(), 1},
-                   {"orchard_end", MakeOrchardEnd(), 1}};
+                   {"orchard_end", MakeOrchardEnd(), 1},
+                   {"form", MakeForm(), 1}};
     for (const auto& [name, made, frames] : samples) {
         SCOPED_TRACE(name);
         EXPECT_TRUE(Committed(name) == made);
