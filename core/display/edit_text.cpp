@@ -117,9 +117,12 @@ void EditText::UpdateFromVariable()
     if (!thread)
         return;
     const SVariable* var = thread->FindVariable(name);
-    if (var)
+    if (var) {
         SetText(var->value ? var->value : "");
-    else if (record.Has(kFieldText))
+        return;
+    }
+    SetText(record.text);
+    if (record.Has(kFieldText))
         thread->SetVariable(name, Text(), 1);
 }
 
@@ -139,6 +142,15 @@ void EditText::SetScroll(S32 scroll)
     layout.SetScroll(scroll);
 }
 
+void SObject::SetCharacter(SCharacter* ch)
+{
+    SCharacter* old = character;
+    character = ch;
+    RetainCharacter(character);
+    MakeEditText();
+    ReleaseCharacter(old);
+}
+
 // A field that an open hold has made keeps its initial text until the hold's end.
 void SObject::MakeEditText()
 {
@@ -148,10 +160,12 @@ void SObject::MakeEditText()
         editText->UpdateFromVariable();
 }
 
+// The edges go with the field that clips them.
 void SObject::FreeEditText()
 {
     if (!editText)
         return;
+    FreeCache();
     SPlayer* player = display->splayer;
     if (player && player->focusText.Get() == this)
         player->focusText.Set(nullptr);

@@ -59,6 +59,8 @@ public:
     void Insert(std::string_view s);
     void DeleteSelection() { HasSelection() && MayType() ? ReplaceSelection("") : void(); }
     bool MayType() const { return !record.Has(kFieldReadOnly); }
+    // How often keys, clipboard and mouse have changed the text.
+    U32 Edits() const { return edits; }
     // Nothing is selected any more.
     void LoseFocus();
     // There is one to be seen, now or when it has blinked.
@@ -98,8 +100,10 @@ private:
     void Link();
     void Unlink();
     void MoveCaret(ECaretMove move, bool extend);
+    bool ScrollBy(ECaretMove move);
     void DeleteBy(ECaretMove move);
     void ReplaceSelection(std::string_view s);
+    void SetSelection(U32 from, U32 to);
 
     SObject* obj;
     EditText* previous = nullptr;
@@ -111,9 +115,10 @@ private:
     U32 anchor = 0;
     U32 caret = 0;
     S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move
-    bool selecting = false;         // the mouse is down in it
-    bool caretOn = true;            // blinks
-    REdge* backEdges = nullptr;     // border, background and selection
+    U32 edits = 0;
+    bool selecting = false;     // the mouse is down in it
+    bool caretOn = true;        // blinks
+    REdge* backEdges = nullptr; // border, background and selection
     RColor* backColors = nullptr;
     REdge* maskEdges = nullptr; // the bounds, which the text stays in
     RColor* maskColors = nullptr;

@@ -8,22 +8,23 @@
 
 namespace {
 constexpr int kShift = 0x01;
-constexpr int kCommand = 0x06; // Ctrl or Alt
+constexpr int kFar = 0x02;     // moves go by words, or to the ends of the text
+constexpr int kCommand = 0x06; // what is typed is a command
 
 enum Key { kKeyBackspace = 8, kKeyEnter = 13, kKeyEscape = 27, kKeyDelete = 127 };
 
 // -1: the key does not move the caret.
-int MoveOf(int key)
+int MoveOf(int key, bool far)
 {
     switch (key) {
     case 1:
-        return kCaretLeft;
+        return far ? kCaretWordLeft : kCaretLeft;
     case 2:
-        return kCaretRight;
+        return far ? kCaretWordRight : kCaretRight;
     case 3:
-        return kCaretLineStart;
+        return far ? kCaretTextStart : kCaretLineStart;
     case 4:
-        return kCaretLineEnd;
+        return far ? kCaretTextEnd : kCaretLineEnd;
     case 6:
         return kCaretPageUp;
     case 7:
@@ -45,16 +46,17 @@ bool IsCharacter(int key)
 
 bool EditText::HandleKeyDown(int key, int modifiers)
 {
-    const int move = MoveOf(key);
+    const int move = MoveOf(key, modifiers & kFar);
     if (move >= 0) {
-        MoveCaret(ECaretMove(move), modifiers & kShift);
+        if (MayType() || (modifiers & kShift) || !ScrollBy(ECaretMove(move)))
+            MoveCaret(ECaretMove(move), modifiers & kShift);
         return true;
     }
     const char typed = char(key);
     if (key == kKeyEscape)
         Select(caret, caret);
     else if (key == kKeyBackspace || key == kKeyDelete)
-        DeleteBy(key == kKeyBackspace ? kCaretLeft : kCaretRight);
+        DeleteBy(ECaretMove(MoveOf(key == kKeyBackspace ? 1 : 2, modifiers & kFar)));
     else if (key == kKeyEnter)
         Insert(record.Has(kFieldMultiline) ? "\r" : "");
     else if (IsCharacter(key) && !(modifiers & kCommand))
@@ -62,6 +64,28 @@ bool EditText::HandleKeyDown(int key, int modifiers)
     else
         return false;
     return true;
+}
+
+// A field without a caret is moved itself. False for moves to the side.
+bool EditText::ScrollBy(ECaretMove move)
+{
+    const S32 page = S32(layout.VisibleLines());
+    switch (move) {
+    case kCaretUp:
+    case kCaretDown:
+        SetScroll(Scroll() + (move == kCaretUp ? -1 : 1));
+        return true;
+    case kCaretPageUp:
+    case kCaretPageDown:
+        SetScroll(Scroll() + (move == kCaretPageUp ? -page : page));
+        return true;
+    case kCaretTextStart:
+    case kCaretTextEnd:
+        SetScroll(move == kCaretTextStart ? 1 : MaxScroll());
+        return true;
+    default:
+        return false;
+    }
 }
 
 // Without Shift, a selection is left at the side that the arrow points to.
@@ -108,17 +132,23 @@ void EditText::ReplaceSelection(std::string_view s)
     if (!layout.Replace(at, SelectionEnd() - at, s))
         return;
     obj->display->fields.bytes += Length() - before;
+    edits++;
     Select(at + U32(s.size()), at + U32(s.size()));
 }
 
 void EditText::Select(U32 from, U32 to)
+{
+    SetSelection(from, to);
+    layout.Show(caret);
+}
+
+void EditText::SetSelection(U32 from, U32 to)
 {
     obj->Modify();
     anchor = std::min(from, Length());
     caret = std::min(to, Length());
     goal = TextLayout::kNoGoal;
     caretOn = true;
-    layout.Show(caret);
 }
 
 void EditText::LoseFocus()
@@ -133,7 +163,7 @@ bool EditText::ShowsCaret() const
 {
     const SPlayer* player = obj->display->splayer;
     const bool focused = player && player->focusText.Get() == obj;
-    return focused && MayType() && !HasSelection() && !obj->IsClip();
+    return focused && MayType() && !record.Has(kFieldNoSelect) && !HasSelection() && !obj->IsClip();
 }
 
 void EditText::BlinkCaret()
@@ -142,12 +172,19 @@ void EditText::BlinkCaret()
     caretOn = !caretOn;
 }
 
-// `pt` in the field's own space.
+// The text stays where it is under the pointer, and follows only one that has left the box; else a
+// click on a line that is partly in view would select what comes up there.
 void EditText::Mouse(const SPOINT& pt, bool down)
 {
+    if (!down) {
+        selecting = false;
+        return;
+    }
     const U32 at = layout.OffsetAt(pt);
-    Select(selecting ? anchor : at, at);
-    selecting = down;
+    SetSelection(selecting ? anchor : at, at);
+    if (selecting && !RectPointIn(&layout.Box(), &pt))
+        layout.Show(caret);
+    selecting = true;
 }
 
 void SObject::EditTextMouse(const SPOINT* pt, int down)

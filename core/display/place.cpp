@@ -186,12 +186,9 @@ SObject* DisplayList::MoveObject(SObject* parent, const PlaceInfo* info)
     if (!obj || obj->depth != info->depth || obj->puppet)
         return nullptr;
     obj->Modify();
-    if ((info->flags & PlaceInfo::kCharacter) && MayReplace(obj->character, info->character)) {
-        SCharacter* old = obj->character;
-        obj->character = info->character;
-        RetainCharacter(obj->character);
-        obj->MakeEditText();
-        ReleaseCharacter(old);
+    if ((info->flags & PlaceInfo::kCharacter) && obj->character != info->character &&
+        MayReplace(obj->character, info->character)) {
+        obj->SetCharacter(info->character);
         NoteMask(obj);
     }
     if (info->flags & PlaceInfo::kMatrix)

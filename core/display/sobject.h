@@ -93,8 +93,10 @@ struct SObject {
     // For a mask: the next sibling when `pt` is inside it, else the first sibling beyond its range.
     SObject* HitClipper(const STransform* parentXform, const SPOINT* pt);
 
-    // The character has become a text field, or may have been one: makes the field, which takes its
-    // variable's text, unless an open hold has made the object.
+    // Shows another character, whose text field is made if it is one.
+    void SetCharacter(SCharacter* ch);
+    // The character is new: makes its text field if it is one, which takes its variable's text,
+    // unless an open hold has made the object.
     void MakeEditText();
     void FreeEditText();
     // For any object, of all text fields of its display list that are bound to a variable of the
@@ -135,6 +137,7 @@ private:
     void InvalidateDrawn();
     SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);
     void AddOwnEdges(CRaster* raster, RColor* clip);
+    void DrawEditText(CRaster* raster, RColor* clip);
     RColor* MaskColor() const;
     bool EdgesContain(const SPOINT* pt);
     bool FieldContains(const MATRIX* placed, const SPOINT* pt) const;

@@ -20,9 +20,14 @@ void SObject::Draw(CRaster* raster, STransform placed, RColor* clip)
 void SObject::AddOwnEdges(CRaster* raster, RColor* clip)
 {
     if (editText)
-        editText->Draw(raster, clip);
+        DrawEditText(raster, clip);
     else
         raster->AddEdges(edges, colors, clip);
+}
+
+void SObject::DrawEditText(CRaster* raster, RColor* clip)
+{
+    editText->Draw(raster, clip);
 }
 
 // Draws this object, and what it masks when it is a mask; returns the sibling to go on with.

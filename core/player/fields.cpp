@@ -60,23 +60,28 @@ void SPlayer::SetFocusText(SObject* obj)
 int SPlayer::TextKeyDown(int key, int modifiers)
 {
     EditText* field = Focused(*this);
-    if (field == nullptr || !field->HandleKeyDown(key, modifiers))
+    if (field == nullptr)
         return 0;
-    FinishEdit();
-    return 1;
+    const U32 edits = field->Edits();
+    const bool used = field->HandleKeyDown(key, modifiers);
+    FinishEdit(edits);
+    return used;
 }
 
-// The frame that hears of it may remove the field.
-void SPlayer::FinishEdit()
+// The variable takes the text even when it is not of this edit. The frame that hears of it may
+// remove the field.
+void SPlayer::FinishEdit(U32 editsBefore)
 {
     const char* name;
     const EditText* field = Focused(*this);
+    const bool changed = field->Edits() != editsBefore;
+    focusText.Get()->Modify();
     ScriptThread* thread = field->Bound(&name);
     const SVariable* var = thread != nullptr ? thread->FindVariable(name) : nullptr;
     const char* known = var != nullptr && var->value != nullptr ? var->value : "";
     if (thread != nullptr && std::strcmp(known, field->Text()) != 0) {
         thread->SetVariable(name, field->Text(), 0);
-        const S32 hears = FrameForChange(thread, name);
+        const S32 hears = changed ? FrameForChange(thread, name) : -1;
         if (hears >= 0)
             CallFrame(thread, hears);
     }
@@ -88,11 +93,12 @@ void SPlayer::EditCommand(int command)
     EditText* field = Focused(*this);
     if (field == nullptr || !BeginInput())
         return;
+    const U32 edits = field->Edits();
     if (command == 0)
         field->Select(0, field->Length());
     else if (command == 1)
         field->DeleteSelection();
-    FinishEdit();
+    FinishEdit(edits);
 }
 
 void SPlayer::EditCopy(char** text)
@@ -113,9 +119,10 @@ void SPlayer::EditPaste(const char* text)
     if (clean == nullptr)
         return;
     CleanPasted(clean, field->Record().Has(kFieldMultiline));
+    const U32 edits = field->Edits();
     field->Insert(clean);
     FreeStr(clean);
-    FinishEdit();
+    FinishEdit(edits);
 }
 
 void SPlayer::CursorTick()

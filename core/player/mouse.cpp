@@ -39,7 +39,10 @@ void SPlayer::DragSelection(const SPOINT* pt, int mouseDown)
 SObject* SPlayer::PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, bool* changed)
 {
     const SObject* focused = focusText.Get();
+    const bool overText = scene.textUnderMouse;
     scene.textUnderMouse = IsTextField(hit);
+    if (overText != IsTextField(hit))
+        UpdateCursor();
     if (IsTextField(hit) && mouseDown && !SelectsText()) {
         SetFocusText(hit);
         DragSelection(pt, 1);
@@ -106,6 +109,8 @@ void SPlayer::CancelCapture(int release)
     panning = 0;
     if (!BeginInput())
         return;
+    if (SelectsText())
+        DragSelection(&mousePt, 0);
     mouseState = release ? -1 : 0;
     if (release && LetGoOfButton(&scene)) {
         DoActions();

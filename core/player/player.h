@@ -335,6 +335,9 @@ public:
     // --- menus ---
     void GetMenuState(MenuStatus* status);
     void GetPopupMenuState(MenuStatus* status);
+    // What can be done in the text field that has the focus: canViewAll stands for cut (EditCopy,
+    // then EditCommand(1)), canZoomIn for copy, canZoomOut for paste, zoomed for delete and canPlay
+    // for select all; the others are 0.
     void GetEditMenuState(MenuStatus* status);
     // From now on GetMenuState gives only what is allowed here too.
     void SetMenuState(const MenuStatus& mask);
@@ -392,7 +395,7 @@ private:
     bool SelectsText() const;
     void DragSelection(const SPOINT* pt, int mouseDown);
     int TextKeyDown(int key, int modifiers);
-    void FinishEdit();
+    void FinishEdit(U32 editsBefore);
     void FinishButton(int updateScreen);
     void NotePointer(const SPOINT* pt, int mouseDown);
     const char* FindValue(ScriptThread* thread, const char* path, char* digits);

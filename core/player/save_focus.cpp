@@ -1,5 +1,6 @@
 #include "core/player/save_focus.h"
 
+#include "core/display/edit_text.h"
 #include "core/player/player.h"
 
 // Only what had the focus before the outermost frame counts: objects come and go in those inside.
@@ -8,7 +9,7 @@ void SaveFocus::Save()
     if (nesting++ > 0)
         return;
     Remember(splayer->buttonFocus.object.Get(), &button);
-    Remember(splayer->focusText.Get(), &text);
+    RememberText(splayer->focusText.Get());
     shown = !RectIsEmpty(&splayer->scene.tabFocusRect);
 }
 
@@ -19,7 +20,7 @@ void SaveFocus::Clear()
     if (button.levels > 0 && !splayer->buttonFocus.object)
         RestoreButton(Follow(button));
     if (text.levels > 0 && !splayer->focusText)
-        splayer->focusText.Set(Follow(text));
+        RestoreText(Follow(text));
     Forget();
 }
 
@@ -40,6 +41,25 @@ void SaveFocus::RestoreButton(SObject* obj)
     }
     splayer->buttonFocus.object.Set(obj);
     obj->CalcButtonBounds(&splayer->buttonFocus.bounds);
+}
+
+void SaveFocus::RememberText(const SObject* obj)
+{
+    Remember(obj, &text);
+    if (obj == nullptr || obj->editText == nullptr)
+        return;
+    anchor = obj->editText->Anchor();
+    caret = obj->editText->Caret();
+    scroll = obj->editText->Scroll();
+}
+
+void SaveFocus::RestoreText(SObject* obj)
+{
+    splayer->focusText.Set(obj);
+    if (obj == nullptr || obj->editText == nullptr)
+        return;
+    obj->editText->Select(anchor, caret);
+    obj->editText->SetScroll(scroll);
 }
 
 void SaveFocus::Remember(const SObject* obj, SPath* path) const

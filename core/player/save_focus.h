@@ -9,7 +9,7 @@ class SPlayer;
 // Save before a frame is drawn, Clear after it, nested as frames are. What has the focus at the
 // outermost Save is remembered by its way down the tree, never by a pointer; if it is gone at the
 // outermost Clear and an object with the same character stands where it was, that one gets the
-// focus.
+// focus; a text field, what was selected and in view, too.
 class SaveFocus {
 public:
     explicit SaveFocus(SPlayer* player) : splayer(player) {}
@@ -31,6 +31,8 @@ private:
     };
 
     void RestoreButton(SObject* obj);
+    void RememberText(const SObject* obj);
+    void RestoreText(SObject* obj);
     void Remember(const SObject* obj, SPath* path) const;
     SObject* Follow(const SPath& path) const;
 
@@ -39,4 +41,7 @@ private:
     bool shown = false; // the button's focus, by its highlight
     SPath button;
     SPath text;
+    U32 anchor = 0; // of the text field's selection
+    U32 caret = 0;
+    S32 scroll = 1;
 };

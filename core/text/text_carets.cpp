@@ -131,6 +131,14 @@ U32 TextLayout::Move(U32 offset, ECaretMove move, S32* goal) const
         return MoveLines(offset, -S64(VisibleLines()), goal);
     case kCaretPageDown:
         return MoveLines(offset, VisibleLines(), goal);
+    case kCaretWordLeft:
+    case kCaretWordRight:
+        *goal = kNoGoal;
+        return StepWord(offset, move == kCaretWordRight);
+    case kCaretTextStart:
+    case kCaretTextEnd:
+        *goal = kNoGoal;
+        return move == kCaretTextEnd ? Length() : 0;
     }
     return offset;
 }
@@ -142,6 +150,23 @@ U32 TextLayout::Step(U32 offset, bool forth) const
         return offset;
     offset += forth ? 1 : -1;
     return InsideBreak(offset) ? offset + (forth ? 1 : -1) : offset;
+}
+
+// Where the words of a password begin is nobody's business.
+U32 TextLayout::StepWord(U32 offset, bool forth) const
+{
+    const auto between = [this](U32 at) { return Byte(at) <= ' '; };
+    if (Password())
+        return forth ? Length() : 0;
+    while (forth && offset < Length() && !between(offset))
+        ++offset;
+    while (forth && offset < Length() && between(offset))
+        ++offset;
+    while (!forth && offset > 0 && between(offset - 1))
+        --offset;
+    while (!forth && offset > 0 && !between(offset - 1))
+        --offset;
+    return offset;
 }
 
 // The goal is kept as it would be without scrolling to the side, which may change meanwhile.

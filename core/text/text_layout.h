@@ -25,6 +25,10 @@ enum ECaretMove : U8 {
     kCaretLineEnd,
     kCaretPageUp,
     kCaretPageDown,
+    kCaretWordLeft, // to the start of a word
+    kCaretWordRight,
+    kCaretTextStart,
+    kCaretTextEnd,
 };
 
 // Holds the text, lays it out in the field's box and keeps what of it is scrolled into view. All
@@ -106,6 +110,7 @@ private:
     S64 LineX(U32 line) const;
     U32 LastCaret(U32 line) const;
     U32 Step(U32 offset, bool forth) const;
+    U32 StepWord(U32 offset, bool forth) const;
     U32 MoveLines(U32 offset, S64 by, S32* goal) const;
     void ShowAcross(S64 x);
 
