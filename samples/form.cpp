@@ -85,7 +85,7 @@ static void DefineFields(TagWriter& movie)
                  .variable = "/desk:count",
                  .text = "0" + kOfMost});
     DefineField(movie, kNoteField,
-                {.width = 186,
+                {.width = 196,
                  .height = 19,
                  .font = kSerif,
                  .size = 12.5,
@@ -93,10 +93,10 @@ static void DefineFields(TagWriter& movie)
                  .color = Hex(0xa03a2a),
                  .variable = "/desk:note"});
     DefineField(movie, kThanksField,
-                {.width = kInnerRight - kInnerLeft,
+                {.width = kInnerRight - kInnerLeft + 16,
                  .height = 36,
                  .font = kFont,
-                 .size = 26,
+                 .size = 22.5,
                  .flags = kShown | kFieldOwnGlyphs,
                  .color = Hex(0xa03a2a),
                  .align = kTextCenter,
@@ -136,11 +136,11 @@ static void DefineButtons(TagWriter& movie, const Font& font)
         .RoundRect(-39, -14, 39, 14, 6);
     plate.Paint(Hex(0xffffff, 50)).RoundRect(-37, -12.6, 37, -11.2, 0.6);
     movie.DefineShape(kPlate, plate.Shape());
-    auto word = [&](U16 id, std::string_view text) {
-        DefineText(movie, id, font, {{text, 0, 5, 14.5, Hex(0xfff4da), 0.5, 0.6}});
+    auto word = [&](U16 id, std::string_view text, double size) {
+        DefineText(movie, id, font, {{text, 0, size * 0.35, size, Hex(0xfff4da), 0.5, 0.6}});
     };
-    word(kSendWord, "Send");
-    word(kAgainWord, "New page");
+    word(kSendWord, "Send", 14.5);
+    word(kAgainWord, "New page", 13);
     DefineButton(movie, kSend, kPlate, kSendWord, {}, SendScript());
     DefineButton(movie, kAgain, kPlate, kAgainWord, {}, AgainScript());
 
@@ -209,7 +209,7 @@ static void PlaceThanks(TagWriter& movie)
     U16 depth = kFirstOfPage;
     movie.Place(kSaturn, depth++, Pose(kMiddle, 118, 0.85, 0.85, -17));
     movie.Place(kThanks, depth++);
-    movie.Place(kThanksField, depth++, At(kInnerLeft, 190));
+    movie.Place(kThanksField, depth++, At(kInnerLeft - 8, 191));
     movie.Place(kReplyField, depth++, At(kInnerLeft + 20, 234));
     movie.Place(kAgain, depth++, At(kMiddle, 308));
 }
