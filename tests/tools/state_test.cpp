@@ -1,4 +1,6 @@
 // What scripts and input do to a movie, as the program tells it.
+#include "core/text/field_record.h"
+#include "tests/support/glyph_writer.h"
 #include "tests/support/script_writer.h"
 #include "tests/tools/tool.h"
 
@@ -110,6 +112,23 @@ TEST_F(Tool, TellsTheStateAsJson)
              R"(,{"name":"Pad","path":null,"depth":5,)" + pad + "0,1000]," + cx + "[0,50,10,60]," +
              frame + "{},",
          "\"depth\":9,\"type\":\"button\"", "]}]}],\"focus\":null,\"requests\":[]}\n"});
+}
+
+// Typed at the first line's start; then the second line is selected from its end, the one in view.
+TEST_F(Tool, TellsWhatFieldsHold)
+{
+    FieldText field = {{0, 2000, 0, 560}, kFieldFont | kFieldMultiline | kFieldText};
+    field.variable = "v", field.text = "one\rtw\xE9\rthree";
+    MovieWriter movie(4000, 2000);
+    movie.Raw(kTagDefineEditText, FieldBody(2, field)).Place2(1, {.character = 2, .name = "f"});
+    Write("../m", (movie.Show(4).End(), movie.Bytes()));
+    Shell("printf '2 down 3 5\\n2 up 3 5\\n2 text x\\n2 key 15\\n2 key 4\\n2 key 3 shift' >../e");
+    ExpectInOrder(Run("state ../m --frame 2 --input ../e").out,
+                  {R"("/f")", R"("v" = "xone\x0dtw\xe9\x0dthree")",
+                   R"(text="xone\x0dtw\xe9\x0dthree" scroll=2/3 selection=8,5)"});
+    ExpectInOrder(
+        Run("state ../m --frame 2 --input ../e --json").out,
+        {R"("text":"xone\u000dtw\u00e9\u000dthree","scroll":2,"maxscroll":3,"selection":[8,5],)"});
 }
 
 TEST_F(Tool, ListsAndTracesActions)
