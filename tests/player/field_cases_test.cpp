@@ -94,7 +94,7 @@ TEST(Fields, HeedTheirFlagsAndVariables)
     EXPECT_TRUE(s.Text(6) == "23" && s.Value("w") == "none" && !s.FindVariable("v.scroll"));
     Picture p = Shot(&s);
     for (U32* row : {&p.At(0, 75), &p.At(0, 150)})
-        EXPECT_TRUE(std::equal(row, row + 104, row + 25 * 200));
+        EXPECT_TRUE(std::equal(row, row + 24 * 200, row + 25 * 200));
     EXPECT_TRUE(p.At(50, 60) == ~0u && p.At(104, 60) << 8 == 0 && p.At(105, 60) == 0xFF00C800);
     EXPECT_TRUE(p.At(114, 13) == p.At(105, 60) && p.At(124, 13) == 0xFFC81E1E);
 }
