@@ -53,10 +53,13 @@ private:
     RColor* glyphColors[2] = {}; // plain, selected
 };
 
-// A mask has neither box nor selection.
+// A mask has neither box nor selection. Its colour is made first, for it hides its range even while
+// it shows no text.
 void FieldPainter::Paint()
 {
-    if (!obj->IsClip()) {
+    if (obj->IsClip()) {
+        GlyphColor(false);
+    } else {
         PaintBox();
         PaintBars();
     }
