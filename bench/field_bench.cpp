@@ -13,8 +13,14 @@
 
 static int gAllocations = 0;
 
-// These stand before the C library's own; operator new comes here too.
-#ifdef __GLIBC__
+// These stand before the C library's own; operator new comes here too. The sanitizers bring their
+// own allocator, with which nothing is counted.
+#if defined(__has_feature)
+#if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
+#define __SANITIZE_ADDRESS__ 1
+#endif
+#endif
+#if defined(__GLIBC__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
 extern "C" {
 void* __libc_malloc(size_t size);
 void* __libc_calloc(size_t count, size_t size);
