@@ -30,7 +30,8 @@ enum Event : U8 {
     kBlink,
     kAfterLast = 0xA0,
 };
-constexpr int kMostEvents = 160;
+// Events are played until they have cost this, with a part for each byte that fields then hold.
+constexpr U32 kMostWork = 600000, kEventWork = 4000;
 constexpr size_t kMuch = 3000;
 constexpr U32 kFewFields = 3, kFewBytes = 50;
 
@@ -63,9 +64,10 @@ public:
     {
         player = wnd;
         player->Tick();
-        for (int i = 0; i < kMostEvents && at < end; ++i) {
+        for (U32 work = 0; work < kMostWork && at < end; work += player->scene.fields.bytes) {
             Step(Byte());
             CheckFields(*player);
+            work += kEventWork;
         }
         player->Tick();
     }
