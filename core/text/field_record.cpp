@@ -1,5 +1,8 @@
 #include "core/text/field_record.h"
 
+#include <algorithm>
+#include <cstring>
+
 #include "core/stream/character.h"
 #include "core/stream/parser.h"
 
@@ -12,7 +15,7 @@ public:
 
 private:
     void ReadLayout(SFieldRecord* r);
-    std::string_view View();
+    std::string_view View(S32 most);
 };
 
 void SFieldReader::Read(SFieldRecord* r)
@@ -28,9 +31,13 @@ void SFieldReader::Read(SFieldRecord* r)
         r->maxLen = GetWord();
     if (r->Has(kFieldLayout))
         ReadLayout(r);
-    r->variable = View();
+    r->variable = View(SFieldRecord::kMaxPath);
+    if (r->variable.size() > size_t(SFieldRecord::kMaxPath)) {
+        r->variable = {};
+        return;
+    }
     if (r->Has(kFieldText))
-        r->text = View();
+        r->text = View(SFieldRecord::kMaxText);
 }
 
 void SFieldReader::ReadLayout(SFieldRecord* r)
@@ -43,16 +50,16 @@ void SFieldReader::ReadLayout(SFieldRecord* r)
     r->leading = S16(GetWord());
 }
 
-// A string that the tag cuts short ends with the tag, not at a zero byte further on.
-std::string_view SFieldReader::View()
+// A string that the tag cuts short ends with the tag, not at a zero byte further on. Of a longer
+// one than asked for no more is looked at than the byte that shows it.
+std::string_view SFieldReader::View(S32 most)
 {
-    const S32 start = pos;
-    while (pos < limit && script[pos] != 0)
-        ++pos;
-    const S32 len = pos - start;
-    Skip(1);
-    return len > 0 ? std::string_view(reinterpret_cast<const char*>(script + start), size_t(len))
-                   : std::string_view();
+    const char* start = reinterpret_cast<const char*>(script) + pos;
+    const size_t room = size_t(std::min(limit - pos, most + 1));
+    const void* zero = room > 0 ? std::memchr(start, 0, room) : nullptr;
+    const size_t len = zero ? size_t(static_cast<const char*>(zero) - start) : room;
+    Skip(S32(len) + 1);
+    return len > 0 ? std::string_view(start, len) : std::string_view();
 }
 } // namespace
 

@@ -31,6 +31,10 @@ enum EFieldAlign : U8 { kTextLeft, kTextRight, kTextCenter, kTextJustify };
 // long as the movie. Whatever the flags do not announce, or the tag is too short for, has the value
 // given here. Lengths are in twips.
 struct SFieldRecord {
+    // Bytes. A longer path is no path, and what follows it is not read; of a text no more counts.
+    static constexpr S32 kMaxPath = 1024;
+    static constexpr S32 kMaxText = 65535;
+
     SRECT bounds = {kRectEmpty, kRectEmpty, kRectEmpty, kRectEmpty};
     U16 flags = 0;               // EFieldFlag bits
     U16 fontId = 0;              // with kFieldFont
