@@ -186,12 +186,22 @@ void DisplayList::FreeCache()
     objectAlloc.FreeEmpties();
     colorAlloc.FreeEmpties();
     threadAlloc.FreeEmpties();
+    fields.FreeSpares();
     raster.FreeEmpties();
 }
 
 void DisplayList::ChargeTags(U32 tags)
 {
     tagsLeft -= std::min(tagsLeft, tags);
+}
+
+// Lines of few bytes cost more than those bytes.
+void DisplayList::ChargeText(U32 bytes, U32 lines)
+{
+    constexpr U32 kBytesPerUnit = 32, kLinesPerUnit = 4, kUnitsPerTag = 8;
+    const U32 units = bytes / kBytesPerUnit + lines / kLinesPerUnit;
+    work += units;
+    ChargeTags(units / kUnitsPerTag);
 }
 
 // Allows a hit test its budgets. `pt` in device units, however far away it is.

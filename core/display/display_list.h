@@ -169,6 +169,9 @@ public:
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
+    // A text of so many bytes and lines has been handled: work, and tags.
+    void ChargeText(U32 bytes, U32 lines = 0);
+
     // Pixels in device coordinates, as far as those reach.
     SPOINT ToDevice(const SPOINT& pixels) const;
     // The topmost object of any kind under `pt` (pixels), or null. Objects lie where the last

@@ -11,12 +11,23 @@
 #include "core/stream/str.h"
 
 namespace {
-constexpr U32 kBytesPerUnit = 32; // of text laid out, in a unit of work
+constexpr U32 kMostSpares = 16;
+constexpr U32 kSpareRoom = 4096;   // bytes of text
+constexpr U32 kFontCost = 1 << 16; // bytes of text that measuring a font is worth
 
 // A name with a dot is that of no plain variable.
 bool IsPlainName(const char* name)
 {
     return *name != 0 && std::strchr(name, '.') == nullptr;
+}
+
+// As much of a variable's value as a field can show.
+std::string_view Value(const char* value)
+{
+    if (!value)
+        return {};
+    const void* end = std::memchr(value, 0, TextLayout::kMaxText);
+    return {value, end ? size_t(static_cast<const char*>(end) - value) : TextLayout::kMaxText};
 }
 
 const char* NameIn(const char* path)
@@ -26,49 +37,87 @@ const char* NameIn(const char* path)
 }
 } // namespace
 
+// Movies that place and remove a field in every frame find it again with its memory.
 EditText* EditText::Create(SObject* obj)
 {
-    if (obj->display->fields.count >= gLimits.textFields)
+    List& list = obj->display->fields;
+    if (list.count >= gLimits.textFields)
         return nullptr;
-    auto* field = new (std::nothrow) EditText(obj);
-    if (field && !field->Prepare()) {
-        delete field;
+    EditText* field = list.spare;
+    if (field) {
+        list.spare = field->next;
+        list.spares--;
+    } else {
+        field = new (std::nothrow) EditText();
+    }
+    if (field && !field->Prepare(obj)) {
+        Destroy(field);
         return nullptr;
     }
     return field;
 }
 
-EditText::EditText(SObject* object) : obj(object), record(object->character)
+void EditText::Destroy(EditText* field)
 {
-    Link();
-}
-
-EditText::~EditText()
-{
-    FreeCache();
-    obj->display->fields.bytes -= Length();
-    Unlink();
-    FreeStr(variable);
-}
-
-bool EditText::Prepare()
-{
-    SPlayer* player = obj->display->splayer;
-    font.Resolve(record, obj->character->player, player ? &player->fontPlayer : nullptr);
-    layout.SetFormat(record, &font);
-    if (!record.variable.empty()) {
-        variable = CreateStr(record.variable.data(), int(record.variable.size()));
-        if (!variable)
-            return false;
-        nameHash = StrHash(NameIn(variable));
+    List& list = field->obj->display->fields;
+    field->FreeCache();
+    field->Unlink();
+    list.bytes -= field->room;
+    if (list.spares >= kMostSpares || field->room > kSpareRoom) {
+        delete field;
+        return;
     }
+    field->next = list.spare;
+    list.spare = field;
+    list.spares++;
+}
+
+void EditText::List::FreeSpares()
+{
+    while (EditText* field = spare) {
+        spare = field->next;
+        delete field;
+    }
+    spares = 0;
+}
+
+bool EditText::Prepare(SObject* object)
+{
+    obj = object;
+    room = edits = anchor = caret = 0;
+    goal = TextLayout::kNoGoal;
+    selecting = false;
+    caretOn = true;
+    Link();
+    layout.Reset();
+    record = SFieldRecord(obj->character);
+    SPlayer* player = obj->display->splayer;
+    if (font.Resolve(record, obj->character->player, player ? &player->fontPlayer : nullptr))
+        obj->display->ChargeText(kFontCost);
+    layout.SetFormat(record, &font);
+    if (!TakePath())
+        return false;
     SetText(record.text);
+    return true;
+}
+
+bool EditText::TakePath()
+{
+    const size_t length = record.variable.size();
+    path.Clear();
+    if (length == 0)
+        return true;
+    if (!path.Resize(length + 1))
+        return false;
+    std::memcpy(path.data(), record.variable.data(), length);
+    nameHash = StrHash(NameIn(path.data()));
     return true;
 }
 
 void EditText::Link()
 {
     List& list = obj->display->fields;
+    next = nullptr;
     previous = list.last;
     (previous ? previous->next : list.first) = this;
     list.last = this;
@@ -83,30 +132,84 @@ void EditText::Unlink()
     list.count--;
 }
 
-// What all the fields hold is limited: lines take many times the memory of their bytes.
+// What all the fields hold is limited: lines take many times the memory of their bytes. A field
+// keeps the room of the longest text it has had.
+U32 EditText::Room() const
+{
+    const U32 others = obj->display->fields.bytes - room;
+    const U32 left = gLimits.textFieldBytes - std::min(others, gLimits.textFieldBytes);
+    return std::min(left, TextLayout::kMaxText);
+}
+
+void EditText::TakeRoom()
+{
+    const U32 more = std::max(Length(), room) - room;
+    room += more;
+    obj->display->fields.bytes += more;
+}
+
 void EditText::SetText(std::string_view text)
 {
-    List& list = obj->display->fields;
-    const size_t room = gLimits.textFieldBytes - (list.bytes - Length());
-    const std::string_view shown = text.substr(0, std::min(room, size_t(layout.kMaxText)));
+    const std::string_view shown = text.substr(0, Room());
+    obj->display->ChargeText(U32(shown.size()));
     if (shown == std::string_view(Text(), Length()))
         return;
-    obj->Modify();
-    list.bytes -= Length();
+    NoteSelection();
     layout.SetText(shown);
-    list.bytes += Length();
-    obj->display->work += Length() / kBytesPerUnit;
+    NoteEdit();
     anchor = std::min(anchor, Length());
     caret = std::min(caret, Length());
     goal = TextLayout::kNoGoal;
+    NoteSelection();
+}
+
+void EditText::NoteLines(U32 from, U32 to)
+{
+    dirtyFrom = std::min(dirtyFrom, from);
+    dirtyTo = std::max(dirtyTo, to);
+    obj->display->needCalcUpdate = 1;
+}
+
+void EditText::NoteSelection()
+{
+    if (HasSelection() || ShowsCaret())
+        NoteLines(layout.LineOf(SelectionStart()), layout.LineOf(SelectionEnd()));
+}
+
+// Lines from top to bottom, with what outlines reach beyond them.
+SRECT EditText::TakeDirt()
+{
+    SRECT strip = record.bounds;
+    if (dirtyFrom > dirtyTo || RectIsEmpty(&strip))
+        RectSetEmpty(&strip);
+    else {
+        const S64 rise = std::max(font.Rise() - font.Ascent(), 0);
+        const S64 fall = std::max(S64(font.Fall()) + font.Ascent(), S64(layout.LineHeight()));
+        strip.ymin = S32(std::max(S64(strip.ymin), layout.LineTop(dirtyFrom) - rise));
+        if (dirtyTo != kNoLine)
+            strip.ymax = S32(std::min(S64(strip.ymax), layout.LineTop(dirtyTo) + fall));
+        if (strip.ymin > strip.ymax)
+            RectSetEmpty(&strip);
+    }
+    dirtyFrom = kNoLine;
+    dirtyTo = 0;
+    return strip;
+}
+
+// The layout has taken a new text.
+void EditText::NoteEdit()
+{
+    TakeRoom();
+    obj->display->ChargeText(Length(), layout.LineCount());
+    NoteLines(layout.ChangedFrom(), layout.ChangedTo());
 }
 
 ScriptThread* EditText::Bound(const char** name) const
 {
     SPlayer* player = obj->display->splayer;
-    if (!variable || !player)
+    if (path.size() == 0 || !player)
         return nullptr;
-    ScriptThread* thread = player->ResolveVariable(variable, obj->thread, name);
+    ScriptThread* thread = player->ResolveVariable(path.data(), obj->thread, name);
     return thread && IsPlainName(*name) ? thread : nullptr;
 }
 
@@ -118,7 +221,7 @@ void EditText::UpdateFromVariable()
         return;
     const SVariable* var = thread->FindVariable(name);
     if (var) {
-        SetText(var->value ? var->value : "");
+        SetText(Value(var->value));
         return;
     }
     SetText(record.text);
@@ -131,7 +234,8 @@ bool EditText::IsBoundTo(const ScriptThread* thread, const char* name, U32 hash)
 {
     obj->display->work++;
     const char* ownName;
-    return variable && hash == nameHash && Bound(&ownName) == thread && StrEqual(ownName, name);
+    return path.size() > 0 && hash == nameHash && Bound(&ownName) == thread &&
+           StrEqual(ownName, name);
 }
 
 void EditText::SetScroll(S32 scroll)
@@ -169,7 +273,7 @@ void SObject::FreeEditText()
     SPlayer* player = display->splayer;
     if (player && player->focusText.Get() == this)
         player->focusText.Set(nullptr);
-    delete editText;
+    EditText::Destroy(editText);
     editText = nullptr;
 }
 
@@ -179,12 +283,13 @@ void SObject::UpdateEditText(const ScriptThread* timeline, const char* varName, 
     if (!display->fields.first)
         return;
     const U32 hash = StrHash(varName);
+    const std::string_view text = Value(value);
     const SPlayer* player = display->splayer;
     for (EditText* f = display->fields.first; f; f = f->next) {
         const bool typedInto = flag == 0 && player && player->focusText.Get() &&
                                player->focusText.Get()->editText == f;
         if (!typedInto && f->IsBoundTo(timeline, varName, hash))
-            f->SetText(value ? value : "");
+            f->SetText(text);
     }
 }
 

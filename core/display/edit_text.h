@@ -1,6 +1,7 @@
 // EditText: the text field of one display object.
 #pragma once
 
+#include "core/geom/grow_buffer.h"
 #include "core/text/field_font.h"
 #include "core/text/field_record.h"
 #include "core/text/text_layout.h"
@@ -18,18 +19,23 @@ struct STransform;
 // field's movie is. All fields of a display list are linked there in the order they were made in.
 class EditText {
 public:
-    // The fields of one display list.
+    // The fields of one display list, and some that are out of use and keep their memory.
     struct List {
         EditText* first = nullptr;
         EditText* last = nullptr;
+        EditText* spare = nullptr;
         U32 count = 0; // at most SLimits::textFields
-        U32 bytes = 0; // of all their texts, at most SLimits::textFieldBytes
+        U32 spares = 0;
+        U32 bytes = 0; // that they have room for, at most SLimits::textFieldBytes
+
+        ~List() { FreeSpares(); }
+        void FreeSpares();
     };
 
     // The field that `obj` shows, with its initial text. Null when memory or a limit forbids it;
     // the object then shows nothing.
     static EditText* Create(SObject* obj);
-    ~EditText();
+    static void Destroy(EditText* field);
     EditText(const EditText&) = delete;
     EditText& operator=(const EditText&) = delete;
 
@@ -82,6 +88,8 @@ public:
     void SetScroll(S32 scroll); // clamped
 
     // --- drawing ---
+    // What has changed since the last call lies there, in the field's own space; empty for nothing.
+    SRECT TakeDirt();
     // Builds box, selection and the lines in view; glyphs go to the object's own edges.
     void Build(const STransform* placed);
     // Hands all to the raster, the text inside the field's bounds only.
@@ -95,27 +103,40 @@ public:
 private:
     friend class FieldPainter;
 
-    explicit EditText(SObject* object);
-    bool Prepare();
+    EditText() = default;
+    ~EditText() = default;
+    bool Prepare(SObject* object);
+    bool TakePath();
     void Link();
     void Unlink();
+    U32 Room() const;
+    void TakeRoom();
+    void NoteLines(U32 from, U32 to);
+    void NoteSelection();
+    void NoteEdit();
     void MoveCaret(ECaretMove move, bool extend);
     bool ScrollBy(ECaretMove move);
     void DeleteBy(ECaretMove move);
     void ReplaceSelection(std::string_view s);
     void SetSelection(U32 from, U32 to);
+    void ShowCaret();
 
-    SObject* obj;
+    static constexpr U32 kNoLine = TextLayout::kLastLine;
+
+    SObject* obj = nullptr;
     EditText* previous = nullptr;
     SFieldRecord record;
     FieldFont font;
     TextLayout layout;
-    char* variable = nullptr; // path, owned; null: not bound
-    U32 nameHash = 0;         // of the name at the path's end
+    GrowBuffer<char> path; // of the bound variable, with its zero byte; empty: not bound
+    U32 nameHash = 0;      // of the name at the path's end
+    U32 room = 0;          // the greatest length that the text has had
     U32 anchor = 0;
     U32 caret = 0;
     S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move
     U32 edits = 0;
+    U32 dirtyFrom = kNoLine; // lines that have changed
+    U32 dirtyTo = 0;
     bool selecting = false;     // the mouse is down in it
     bool caretOn = true;        // blinks
     REdge* backEdges = nullptr; // border, background and selection

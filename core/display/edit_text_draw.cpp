@@ -53,10 +53,14 @@ private:
     RColor* glyphColors[2] = {}; // plain, selected
 };
 
-// A mask has neither box nor selection. Its colour is made first, for it hides its range even while
-// it shows no text.
+// The bounds come first: without them, in a list that is full of edges, nothing shows. A mask has
+// neither box nor selection, and its colour before all glyphs, for it hides its range even while it
+// shows no text.
 void FieldPainter::Paint()
 {
+    RColor* inside = CreateClipColor(display, &field.maskColors);
+    if (inside)
+        AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
     if (obj->IsClip()) {
         GlyphColor(false);
     } else {
@@ -67,9 +71,6 @@ void FieldPainter::Paint()
         PaintLine(line);
     if (field.caretOn && field.ShowsCaret())
         PaintCaret();
-    RColor* inside = CreateClipColor(display, &field.maskColors);
-    if (inside)
-        AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
 }
 
 bool FieldPainter::InView(U32 line) const

@@ -115,11 +115,8 @@ void EditText::Insert(std::string_view s)
 {
     if (!MayType() || s.empty())
         return;
-    const EditText::List& list = obj->display->fields;
     const U32 kept = Length() - (SelectionEnd() - SelectionStart());
-    const U32 others = list.bytes - Length();
-    const U32 most = std::min({record.maxLen, TextLayout::kMaxText,
-                               gLimits.textFieldBytes - std::min(others, gLimits.textFieldBytes)});
+    const U32 most = std::min(record.maxLen, Room());
     s = s.substr(0, most - std::min(most, kept));
     if (!s.empty())
         ReplaceSelection(s);
@@ -127,11 +124,11 @@ void EditText::Insert(std::string_view s)
 
 void EditText::ReplaceSelection(std::string_view s)
 {
-    const U32 at = SelectionStart(), before = Length();
-    obj->Modify();
+    const U32 at = SelectionStart();
+    NoteSelection();
     if (!layout.Replace(at, SelectionEnd() - at, s))
         return;
-    obj->display->fields.bytes += Length() - before;
+    NoteEdit();
     edits++;
     Select(at + U32(s.size()), at + U32(s.size()));
 }
@@ -139,16 +136,31 @@ void EditText::ReplaceSelection(std::string_view s)
 void EditText::Select(U32 from, U32 to)
 {
     SetSelection(from, to);
-    layout.Show(caret);
+    ShowCaret();
 }
 
+void EditText::ShowCaret()
+{
+    if (layout.Show(caret))
+        NoteLines(0, kNoLine);
+}
+
+// While one end stays, what lies between the old other end and the new one changes.
 void EditText::SetSelection(U32 from, U32 to)
 {
-    obj->Modify();
+    const U32 oldCaret = std::min(caret, Length());
+    const bool moves = HasSelection() && from == anchor && from != to;
+    if (!moves)
+        NoteSelection();
     anchor = std::min(from, Length());
     caret = std::min(to, Length());
     goal = TextLayout::kNoGoal;
     caretOn = true;
+    if (moves)
+        NoteLines(layout.LineOf(std::min(oldCaret, caret)),
+                  layout.LineOf(std::max(oldCaret, caret)));
+    else
+        NoteSelection();
 }
 
 void EditText::LoseFocus()
@@ -168,7 +180,7 @@ bool EditText::ShowsCaret() const
 
 void EditText::BlinkCaret()
 {
-    obj->Modify();
+    NoteSelection();
     caretOn = !caretOn;
 }
 
@@ -183,7 +195,7 @@ void EditText::Mouse(const SPOINT& pt, bool down)
     const U32 at = layout.OffsetAt(pt);
     SetSelection(selecting ? anchor : at, at);
     if (selecting && !RectPointIn(&layout.Box(), &pt))
-        layout.Show(caret);
+        ShowCaret();
     selecting = true;
 }
 

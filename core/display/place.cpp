@@ -3,6 +3,7 @@
 #include <cstdio>
 
 #include "core/display/display_list.h"
+#include "core/display/edit_text.h"
 #include "core/player/limits.h"
 #include "core/player/player.h"
 #include "core/stream/script_player.h"
@@ -84,7 +85,8 @@ SObject* DisplayList::FindChild(SObject* parent, U16 depth)
 // Before anything is searched: loading the fonts places and removes an object.
 void DisplayList::PrepareField(const SCharacter* character)
 {
-    if (character->type == kCharEditText && splayer)
+    if (character->type == kCharEditText && splayer &&
+        FieldFont::WantsBuiltIn(SFieldRecord(character), character->player))
         splayer->LoadBuiltInFonts();
 }
 

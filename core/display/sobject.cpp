@@ -52,6 +52,8 @@ void SObject::CalcUpdate(const MATRIX* parentMat, bool forced)
         InvalidateRemasked(); // while the children still know their old places
     if (forced)
         Recalculate(&mat);
+    else if (editText)
+        RecalculateText(&mat);
     for (SObject* child = bottomChild; child; child = child->above)
         child->CalcUpdate(&mat, forced);
 }
@@ -65,6 +67,19 @@ void SObject::Recalculate(const MATRIX* mat)
     CalcDevBounds(mat);
     display->InvalidateRect(&devBounds);
     dirty = 0;
+    if (editText)
+        editText->TakeDirt();
+}
+
+// A field whose text alone has changed.
+void SObject::RecalculateText(const MATRIX* mat)
+{
+    SRECT changed = editText->TakeDirt();
+    if (RectIsEmpty(&changed))
+        return;
+    MatrixTransformRect(mat, &changed, &changed);
+    FreeCache();
+    display->InvalidateRect(&changed);
 }
 
 // A mask in the range that reaches beyond it is drawn itself, and what it masks shows inside it

@@ -133,6 +133,7 @@ private:
     void BuildNoted(const STransform* placed);
     bool MayShowIn(const SRECT* area) const;
     void Recalculate(const MATRIX* mat);
+    void RecalculateText(const MATRIX* mat);
     void InvalidateRemasked();
     void InvalidateDrawn();
     SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);

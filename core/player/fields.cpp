@@ -75,7 +75,6 @@ void SPlayer::FinishEdit(U32 editsBefore)
     const char* name;
     const EditText* field = Focused(*this);
     const bool changed = field->Edits() != editsBefore;
-    focusText.Get()->Modify();
     ScriptThread* thread = field->Bound(&name);
     const SVariable* var = thread != nullptr ? thread->FindVariable(name) : nullptr;
     const char* known = var != nullptr && var->value != nullptr ? var->value : "";

@@ -57,8 +57,8 @@ struct SLimits {
     // Of these, names that share a place in the index, which only chosen ones do. Further ones are
     // dropped.
     U32 variablesAlike = 32;
-    // Text fields alive in one display list, and the bytes of all their texts. Further fields show
-    // nothing, longer texts are cut.
+    // Text fields alive in one display list, and the bytes of the longest texts that they have had.
+    // Further fields show nothing, longer texts are cut.
     U32 textFields = 4096;
     U32 textFieldBytes = 4u << 20;
     // Bytes of a stream of variables; the rest is dropped.

@@ -35,7 +35,7 @@ void SPlayer::DragSelection(const SPOINT* pt, int mouseDown)
 }
 
 // Keeps text fields from the buttons' business: returns what is under the pointer for them. A press
-// moves the keyboard focus.
+// moves the keyboard focus, but not while it is that of a button, which is to hear of its end.
 SObject* SPlayer::PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, bool* changed)
 {
     const SObject* focused = focusText.Get();
@@ -43,7 +43,7 @@ SObject* SPlayer::PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, boo
     scene.textUnderMouse = IsTextField(hit);
     if (overText != IsTextField(hit))
         UpdateCursor();
-    if (IsTextField(hit) && mouseDown && !SelectsText()) {
+    if (IsTextField(hit) && mouseDown && !SelectsText() && !PressesButton()) {
         SetFocusText(hit);
         DragSelection(pt, 1);
     } else if (!IsTextField(hit) && mouseDown && focused != nullptr &&
@@ -138,8 +138,12 @@ void SPlayer::PanTo(const SPOINT* pt)
 
 bool SPlayer::MouseIsHeld() const
 {
-    const bool pressed = scene.button != nullptr && scene.buttonState >= 3;
-    return drag.object || panning || SelectsText() || pressed;
+    return drag.object || panning || SelectsText() || PressesButton();
+}
+
+bool SPlayer::PressesButton() const
+{
+    return scene.button != nullptr && scene.buttonState >= 3;
 }
 
 // Buttons that move under a pointer at rest change their state.

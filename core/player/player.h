@@ -393,6 +393,7 @@ private:
     bool BeginInput();
     SObject* PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, bool* changed);
     bool SelectsText() const;
+    bool PressesButton() const;
     void DragSelection(const SPOINT* pt, int mouseDown);
     int TextKeyDown(int key, int modifiers);
     void FinishEdit(U32 editsBefore);

@@ -14,13 +14,17 @@ struct SFontCodes {
     const U8* info;  // the information record at that time: one may arrive later
     U16 glyphs[256]; // 0xFFFF: none
     S16 widths[256]; // in the em's units: of the layout, or how far the outline reaches
+    S32 rise;        // of all outlines, in the em's units; kUnknown: one was not measured
+    S32 fall;
 };
 
 namespace {
 constexpr U16 kNone = 0xFFFF;
-constexpr U32 kFirstCode = 32;        // of a font that does not say its codes
-constexpr U32 kOutlineRecords = 8192; // read of one font to measure its glyphs
-constexpr U16 kBuiltInIds = 256;      // the built-in fonts have lower ones
+constexpr U32 kFirstCode = 32;         // of a font that does not say its codes
+constexpr U32 kOutlineRecords = 16384; // read of one font to measure its glyphs
+constexpr U16 kBuiltInIds = 256;       // the built-in fonts have lower ones
+constexpr S32 kUnknown = -1;
+constexpr S32 kMostReach = 0x7FFF; // of an outline that is measured, in the em's units
 
 char Folded(char c)
 {
@@ -62,14 +66,14 @@ void EnterCodes(const SFont& font, SFontCodes* codes)
         codes->glyphs[code] = U16(code - kFirstCode);
 }
 
-// How far an outline reaches to the right. `left` is the number of records that may be read.
-S16 OutlineWidth(const SBytes& outline, U32* left)
+// Where an outline lies. `left` is the number of records that may be read.
+SRECT OutlineBounds(const SBytes& outline, U32* left)
 {
     const MATRIX same = {0x10000, 0, 0, 0x10000, 0, 0};
     RColor* none = nullptr;
     SShapeParser parser(nullptr, nullptr, &none, outline.at, S32(outline.len), 0, &same);
     parser.GetSelectorWidths();
-    S32 xmax = 0;
+    SRECT all = {0, 0, 0, 0};
     CURVE c;
     for (int what = 0; what != SShapeParser::kEndOfShape && *left > 0; --*left) {
         what = parser.GetShapeEdge(&c);
@@ -77,29 +81,36 @@ S16 OutlineWidth(const SBytes& outline, U32* left)
         RectSetEmpty(&r);
         if (what == 0)
             CurveTightBounds(&c, &r);
-        xmax = std::max(xmax, r.xmax);
+        RectUnion(&all, &r, &all);
     }
-    return S16(std::min(xmax, 0x7FFF));
+    return all;
 }
 
-void EnterWidths(const SFont& font, SFontCodes* codes)
+void Measure(const SFont& font, SFontCodes* codes)
 {
     U32 left = kOutlineRecords;
+    codes->rise = codes->fall = 0;
     for (int code = 0; code < 256; ++code) {
         const U32 glyph = codes->glyphs[code];
         codes->widths[code] = 0;
         if (glyph == kNone)
             continue;
-        codes->widths[code] =
-            font.HasLayout() ? S16(font.Advance(glyph)) : OutlineWidth(font.Glyph(glyph), &left);
+        const SRECT r = OutlineBounds(font.Glyph(glyph), &left);
+        const S32 width = font.HasLayout() ? font.Advance(glyph) : r.xmax;
+        codes->widths[code] = S16(std::min(width, kMostReach));
+        codes->rise = std::max(codes->rise, -S32(std::max(r.ymin, -kMostReach)));
+        codes->fall = std::max(codes->fall, std::min(r.ymax, kMostReach));
     }
+    if (left == 0 || codes->rise == kMostReach || codes->fall == kMostReach)
+        codes->rise = codes->fall = kUnknown;
 }
 
 // Kept in the character when there is memory for it, else in `spare`.
-const SFontCodes& CodesOf(SCharacter* ch, const SFont& font, SFontCodes* spare)
+const SFontCodes& CodesOf(SCharacter* ch, const SFont& font, SFontCodes* spare, bool* measured)
 {
     auto* codes = static_cast<SFontCodes*>(ch->font.cache);
-    if (codes && codes->info == ch->font.info)
+    *measured = !codes || codes->info != ch->font.info;
+    if (!*measured)
         return *codes;
     if (!codes)
         ch->font.cache = codes = static_cast<SFontCodes*>(std::malloc(sizeof(SFontCodes)));
@@ -107,7 +118,7 @@ const SFontCodes& CodesOf(SCharacter* ch, const SFont& font, SFontCodes* spare)
         codes = spare;
     codes->info = ch->font.info;
     EnterCodes(font, codes);
-    EnterWidths(font, codes);
+    Measure(font, codes);
     return *codes;
 }
 
@@ -144,14 +155,22 @@ const char* DeviceFontFor(std::string_view name)
     return "_sans";
 }
 
-void FieldFont::Resolve(const SFieldRecord& field, ScriptPlayer* movie, ScriptPlayer* builtIn)
+bool FieldFont::WantsBuiltIn(const SFieldRecord& field, ScriptPlayer* movie)
+{
+    return !field.Has(kFieldOwnGlyphs) || !field.Has(kFieldFont) || !FindFont(movie, field.fontId);
+}
+
+bool FieldFont::Resolve(const SFieldRecord& field, ScriptPlayer* movie, ScriptPlayer* builtIn)
 {
     height = field.height;
     SCharacter* named = field.Has(kFieldFont) ? FindFont(movie, field.fontId) : nullptr;
     if (named && field.Has(kFieldOwnGlyphs))
         return Take(named);
     SCharacter* device = FindNamed(builtIn, DeviceFontFor(SFont(named).Name()));
-    device ? Take(device) : TakeNone();
+    if (device)
+        return Take(device);
+    TakeNone();
+    return false;
 }
 
 void FieldFont::TakeNone()
@@ -162,11 +181,13 @@ void FieldFont::TakeNone()
     ascent = height * 4 / 5;
     descent = height - ascent;
     leading = 0;
+    rise = fall = 0;
 }
 
-void FieldFont::Take(SCharacter* ch)
+bool FieldFont::Take(SCharacter* ch)
 {
     SFontCodes spare;
+    bool measured;
     TakeNone();
     font = SFont(ch);
     if (font.HasLayout()) {
@@ -174,13 +195,16 @@ void FieldFont::Take(SCharacter* ch)
         descent = Scale(font.Descent());
         leading = Scale(font.Leading());
     }
-    Measure(CodesOf(ch, font, &spare));
+    Measure(CodesOf(ch, font, &spare, &measured));
+    return measured;
 }
 
 // A font without a layout gets a little room beside each outline, and spaces of a quarter.
 void FieldFont::Measure(const SFontCodes& codes)
 {
     std::memcpy(glyphs, codes.glyphs, sizeof glyphs);
+    rise = codes.rise == kUnknown ? kFar : Scale(codes.rise) + 1;
+    fall = codes.fall == kUnknown ? kFar : Scale(codes.fall) + 1;
     for (int code = 0; code < 256; ++code) {
         const bool space = code == ' ';
         if (glyphs[code] == kNoGlyph)

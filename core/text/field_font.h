@@ -19,7 +19,10 @@ public:
     // Finds the font of a field. `movie` is the field's, `builtIn` the movie of the built-in fonts;
     // either may be null. A font of the movie is taken when the field asks for one and it is there;
     // else a built-in one by the name of the font that the field gives.
-    void Resolve(const SFieldRecord& field, ScriptPlayer* movie, ScriptPlayer* builtIn);
+    // True when the font was measured, which is done once for each font and takes a while.
+    bool Resolve(const SFieldRecord& field, ScriptPlayer* movie, ScriptPlayer* builtIn);
+    // The field will need a built-in font.
+    static bool WantsBuiltIn(const SFieldRecord& field, ScriptPlayer* movie);
 
     // Where the outlines are; see SFont::Glyph.
     const SFont& Font() const { return font; }
@@ -32,11 +35,16 @@ public:
     S32 Ascent() const { return ascent; }   // from a line's top to its baseline
     S32 Descent() const { return descent; } // from there to its bottom
     S32 Leading() const { return leading; } // below that, to the next line
+    // How far outlines reach above and below the baseline, at least 0; kFar where that is not
+    // known.
+    S32 Rise() const { return rise; }
+    S32 Fall() const { return fall; }
+    static constexpr S32 kFar = 0x3FFFFFFF;
 
 private:
     static constexpr U16 kNoGlyph = 0xFFFF; // no font has that many glyphs
 
-    void Take(SCharacter* ch);
+    bool Take(SCharacter* ch);
     void TakeNone();
     void Measure(const SFontCodes& codes);
     S32 Scale(S32 em) const { return (em * height + 512) >> 10; }
@@ -46,6 +54,8 @@ private:
     S32 ascent = 0;
     S32 descent = 0;
     S32 leading = 0;
+    S32 rise = 0;
+    S32 fall = 0;
     U16 glyphs[256] = {}; // by code
     S32 advances[256] = {};
 };

@@ -221,14 +221,16 @@ void TextLayout::ShowAcross(S64 x)
     hScroll = S32(std::clamp<S64>(shift, 0, kFar));
 }
 
-// After a change: no farther than to the last line, nor than to the end of the longest.
-void TextLayout::ClampScroll()
+// After a change: no farther than to the last line, nor than to the end of the longest. True when
+// that moved something.
+bool TextLayout::ClampScroll()
 {
+    const U32 oldFirst = firstLine;
+    const S32 oldShift = hScroll;
     SetScroll(Scroll());
-    if (hScroll == 0)
-        return;
     S64 most = 0;
-    for (U32 line = 0; line < LineCount() && !Wraps(); ++line)
+    for (U32 line = 0; hScroll != 0 && line < LineCount() && !Wraps(); ++line)
         most = std::max(most, LineX(line) + Line(line).width + right - box.xmax);
     hScroll = S32(std::min<S64>(hScroll, most));
+    return firstLine != oldFirst || hScroll != oldShift;
 }

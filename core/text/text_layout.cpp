@@ -31,6 +31,15 @@ U32 SharedEnd(const char* aEnd, const char* bEnd, U32 most)
 }
 } // namespace
 
+void TextLayout::Reset()
+{
+    text.Clear();
+    lines.Clear();
+    font = nullptr;
+    firstLine = 0;
+    hScroll = 0;
+}
+
 void TextLayout::SetFormat(const SFieldRecord& field, const FieldFont* fieldFont)
 {
     const SRECT& b = field.bounds;
@@ -143,7 +152,19 @@ void TextLayout::LayOut(U32 at, U32 removed, U32 added)
             break;
     }
     Splice(first, whole ? keep : U32(lines.size()), delta);
-    ClampScroll();
+    NoteChange(first, keep);
+    if (ClampScroll())
+        changedFrom = 0, changedTo = kLastLine;
+    if (fresh.size() > kKeptFresh)
+        fresh.Release();
+}
+
+// The fresh lines stand in for those from `first` to before `keep`.
+void TextLayout::NoteChange(U32 first, U32 keep)
+{
+    const bool sameCount = whole && keep - first == fresh.size();
+    changedFrom = first;
+    changedTo = sameCount ? keep - 1 : kLastLine;
 }
 
 // Puts the fresh lines in the place of old ones from `first` to before `keep`, and moves the

@@ -41,11 +41,14 @@ enum ECaretMove : U8 {
 // memory is taken once the buffers have grown to the text.
 class TextLayout {
 public:
-    static constexpr U32 kMaxText = 65535;  // bytes
-    static constexpr S32 kNoGoal = kS32Min; // see Move
-    static constexpr S32 kInset = 40;       // of the box from the bounds
+    static constexpr U32 kMaxText = SFieldRecord::kMaxText; // bytes
+    static constexpr U32 kLastLine = 0xFFFFFFFF;            // or any beyond the text's
+    static constexpr S32 kNoGoal = kS32Min;                 // see Move
+    static constexpr S32 kInset = 40;                       // of the box from the bounds
     static constexpr S32 kLeastLineHeight = 20;
 
+    // Drops text, format and scrolling and keeps the memory.
+    void Reset();
     // Lays all out anew for a field; to be repeated when the font has changed. `fieldFont` outlives
     // this.
     void SetFormat(const SFieldRecord& field, const FieldFont* fieldFont);
@@ -59,6 +62,11 @@ public:
     // Zero-terminated; valid until the next change.
     const char* Text() const { return text.size() > 0 ? text.data() : ""; }
     U32 Length() const { return text.size() > 0 ? U32(text.size() - 1) : 0; }
+
+    // Lines that the last change of the text moved or laid out anew: all that can look different.
+    // The last is kLastLine when there may be more or fewer behind the first.
+    U32 ChangedFrom() const { return changedFrom; }
+    U32 ChangedTo() const { return changedTo; }
 
     // --- lines ---
     U32 LineCount() const { return lines.size() > 0 ? U32(lines.size()) : 1; }
@@ -98,6 +106,7 @@ public:
 private:
     friend class LineWalk;
     static constexpr U32 kNoLine = 0xFFFFFFFF;
+    static constexpr size_t kKeptFresh = 1024; // lines; room for more is given back
 
     bool SeveralLines() const { return flags & kFieldMultiline; }
     bool Wraps() const { return (flags & kFieldWrap) && SeveralLines(); }
@@ -119,7 +128,8 @@ private:
     U32 EndAtBreak(U32 at, STextLine* line) const;
     U32 FirstThatSaw(U32 at) const;
     void Splice(U32 first, U32 keep, U32 delta);
-    void ClampScroll();
+    void NoteChange(U32 first, U32 keep);
+    bool ClampScroll();
 
     const FieldFont* font = nullptr;
     GrowBuffer<char> text;       // and its zero byte; empty before the first
@@ -133,6 +143,8 @@ private:
     S32 right = 0;
     S32 indent = 0;
     S32 lineHeight = kLeastLineHeight;
+    U32 changedFrom = 0;
+    U32 changedTo = 0;
     U32 firstLine = 0; // of those in view
     S32 hScroll = 0;
 };

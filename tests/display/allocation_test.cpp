@@ -3,7 +3,9 @@
 #include <fstream>
 #include <iterator>
 
+#include "core/text/field_record.h"
 #include "tests/display/scene.h"
+#include "tests/support/glyph_writer.h"
 
 // The sanitizers bring their own allocator, which cannot be counted from here.
 #if defined(__has_feature)
@@ -39,22 +41,34 @@ void* realloc(void* old, size_t size) noexcept
 }
 }
 
-TEST(Allocation, NoneOnceWarm)
+static int AllocationsOf(const std::vector<U8>& movie, S32 ticks)
 {
-    std::ifstream file(VEXEL_SOURCE_DIR "/samples/viaduct.vxm", std::ios::binary);
-    const std::vector<char> movie(std::istreambuf_iterator<char>(file), {});
     NativePlayerWnd player(0, 0);
-    player.Feed(reinterpret_cast<const U8*>(movie.data()), movie.size());
+    player.Feed(movie.data(), movie.size());
     player.EndOfData();
-    const auto play = [&player](S32 ticks) {
-        for (; ticks > 0; ticks--)
+    const auto play = [&player](S32 count) {
+        for (; count > 0; count--)
             player.Tick();
     };
     play(player.numFrames + 1);
     EXPECT_EQ(player.curFrame, 1) << "one whole loop";
     const int before = gAllocations;
-    play(200);
-    EXPECT_EQ(gAllocations - before, 0);
+    play(ticks);
+    return gAllocations - before;
+}
+
+TEST(Allocation, NoneOnceWarm)
+{
+    std::ifstream file(VEXEL_SOURCE_DIR "/samples/viaduct.vxm", std::ios::binary);
+    const std::vector<char> movie(std::istreambuf_iterator<char>(file), {});
+    EXPECT_EQ(AllocationsOf({movie.begin(), movie.end()}, 200), 0);
+    MovieWriter fields(4000, 4000, Fps(10));
+    fields.Raw(kTagDefineEditText, FieldBody(2, {.box = {0, 900, 0, 500},
+                                                 .flags = kFieldText,
+                                                 .variable = "v",
+                                                 .text = "come and go"}));
+    fields.Place(2, 1).Show(3).RemoveDepth(1).Show(2).End();
+    EXPECT_EQ(AllocationsOf(fields.Bytes(), 40), 0);
 }
 #else
 TEST(Allocation, NoneOnceWarm)

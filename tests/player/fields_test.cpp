@@ -1,4 +1,5 @@
 // Text fields in a movie: what they show, and the variables that they are bound to.
+#include "core/player/limits.h"
 #include "tests/player/fields_scene.h"
 
 namespace {
@@ -83,6 +84,59 @@ TEST(Fields, BlinkWhereTypingGoes)
     EXPECT_TRUE(caret());
     s.MouseDown(50, 100);
     EXPECT_FALSE(caret() || (s.CursorTick(), caret()));
+}
+
+// Outlines that reach far beyond their lines, where one line changes; the last may be measured no
+// more.
+TEST(Fields, PaintWhatReachesBeyondALine)
+{
+    for (int rects : {1, 5000}) {
+        MovieWriter movie(4000, 4000, Fps(10));
+        ShapeBuilder tall;
+        tall.AddFill(Rgba{});
+        tall.Fill1(1).Rect(0, -2000, 100, 1500);
+        for (int i = 1; i < rects; i++)
+            tall.Rect(0, 0, 10, 10);
+        const FontText text = {"Tall", 0x80, {'i', 'a'}, {819, 205, 0, 512, 512}};
+        movie.Raw(kTagDefineFont2, Font2Body(1, {ShapeBuilder(), tall}, text));
+        movie.Raw(kTagDefineEditText, FieldBody(2, {.box = {0, 4000, 0, 4000},
+                                                    .flags = kLines,
+                                                    .variable = "v",
+                                                    .text = "ii\rii\rii\rii\rii"}));
+        Stage s(movie.Place(2, 1));
+        for (const char* changed : {"ii\rii\rai\rii\rii", "ii\rii\rii\rii\rii"}) {
+            const Picture before = Shot(&s);
+            s.Set("v", changed);
+            const Picture part = Shot(&s);
+            EXPECT_NE("", ExpectSame(before, part, "tall-changed"));
+            s.scene.FreeCache(), s.scene.ModifyCamera();
+            EXPECT_EQ("", ExpectSame(part, Shot(&s), "tall")) << rects;
+        }
+    }
+}
+
+TEST(Fields, KeepToTheirLimits)
+{
+    gLimits.textFieldBytes = 100, gLimits.textFields = 2;
+    MovieWriter movie = Begin();
+    for (U16 id : {2, 3, 4}) {
+        const std::string name(id == 2 ? 1024 : id == 3 ? 1025 : 1, 'n');
+        const Box box = {0, 900, 0, 500};
+        movie.Raw(kTagDefineEditText,
+                  FieldBody(id, {.box = box, .flags = kUsual, .variable = name, .text = "t"}));
+    }
+    Stage s(movie.Place(2, 1).Place(3, 2).Place(4, 3));
+    EXPECT_TRUE(s.Text(1) == "t" && s.Text(2) == "" && !s.Field(3));
+    const std::string path(1024, 'n'), longText(80, 'x');
+    s.Set(path.c_str(), longText.c_str()), s.Set(path.c_str(), "");
+    s.scene.RemoveObject(s.rootObject, 2);
+    PlaceInfo info;
+    info.Clear();
+    info.flags = PlaceInfo::kCharacter, info.depth = 4, info.character = s.FindCharacter(4);
+    s.scene.PlaceObject(s.rootObject, &info);
+    s.Set("n", longText.c_str());
+    EXPECT_EQ(longText.substr(0, 20), s.Text(4)) << "the other's room is taken";
+    gLimits = {};
 }
 
 } // namespace
