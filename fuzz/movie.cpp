@@ -48,7 +48,8 @@ void CheckFields(const SPlayer& player)
     U32 count = 0, bytes = 0;
     for (const EditText* field = list.first; field != nullptr; field = field->next) {
         ++count;
-        bytes += field->Length();
+        bytes += field->Room();
+        Holds(field->Length() <= field->Room());
         Holds(field->Anchor() <= field->Length() && field->Caret() <= field->Length());
         Holds(field->Scroll() >= 1 && field->Scroll() <= field->MaxScroll());
         Holds(std::char_traits<char>::length(field->Text()) == field->Length());

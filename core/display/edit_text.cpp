@@ -132,9 +132,9 @@ void EditText::Unlink()
     list.count--;
 }
 
-// What all the fields hold is limited: lines take many times the memory of their bytes. A field
-// keeps the room of the longest text it has had.
-U32 EditText::Room() const
+// The greatest length that the limit for all fields leaves to this one. What counts is the room
+// that they keep, for lines take many times the memory of their bytes.
+U32 EditText::Allowed() const
 {
     const U32 others = obj->display->fields.bytes - room;
     const U32 left = gLimits.textFieldBytes - std::min(others, gLimits.textFieldBytes);
@@ -150,7 +150,7 @@ void EditText::TakeRoom()
 
 void EditText::SetText(std::string_view text)
 {
-    const std::string_view shown = text.substr(0, Room());
+    const std::string_view shown = text.substr(0, Allowed());
     obj->display->ChargeText(U32(shown.size()));
     if (shown == std::string_view(Text(), Length()))
         return;

@@ -42,6 +42,7 @@ public:
     const SFieldRecord& Record() const { return record; }
     const char* Text() const { return layout.Text(); }
     U32 Length() const { return layout.Length(); }
+    U32 Room() const { return room; } // the greatest length that it has had
     // Replaces the text as scripts do, whatever the field's greatest length: selection and
     // scrolling stay as far as the new text allows.
     void SetText(std::string_view text);
@@ -109,7 +110,7 @@ private:
     bool TakePath();
     void Link();
     void Unlink();
-    U32 Room() const;
+    U32 Allowed() const;
     void TakeRoom();
     void NoteLines(U32 from, U32 to);
     void NoteSelection();
@@ -130,7 +131,7 @@ private:
     TextLayout layout;
     GrowBuffer<char> path; // of the bound variable, with its zero byte; empty: not bound
     U32 nameHash = 0;      // of the name at the path's end
-    U32 room = 0;          // the greatest length that the text has had
+    U32 room = 0;
     U32 anchor = 0;
     U32 caret = 0;
     S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move

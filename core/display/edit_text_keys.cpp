@@ -116,7 +116,7 @@ void EditText::Insert(std::string_view s)
     if (!MayType() || s.empty())
         return;
     const U32 kept = Length() - (SelectionEnd() - SelectionStart());
-    const U32 most = std::min(record.maxLen, Room());
+    const U32 most = std::min(record.maxLen, Allowed());
     s = s.substr(0, most - std::min(most, kept));
     if (!s.empty())
         ReplaceSelection(s);
