@@ -9,42 +9,8 @@
 #include "core/display/edit_text.h"
 #include "core/text/field_record.h"
 #include "platform/headless/native_player.h"
+#include "tests/support/allocation_counter.h"
 #include "tests/support/glyph_writer.h"
-
-static int gAllocations = 0;
-
-// These stand before the C library's own; operator new comes here too. The sanitizers bring their
-// own allocator, with which nothing is counted.
-#if defined(__has_feature)
-#if __has_feature(address_sanitizer) || __has_feature(thread_sanitizer)
-#define __SANITIZE_ADDRESS__ 1
-#endif
-#endif
-#if defined(__GLIBC__) && !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
-extern "C" {
-void* __libc_malloc(size_t size);
-void* __libc_calloc(size_t count, size_t size);
-void* __libc_realloc(void* old, size_t size);
-
-void* malloc(size_t size) noexcept
-{
-    gAllocations++;
-    return __libc_malloc(size);
-}
-
-void* calloc(size_t count, size_t size) noexcept
-{
-    gAllocations++;
-    return __libc_calloc(count, size);
-}
-
-void* realloc(void* old, size_t size) noexcept
-{
-    gAllocations++;
-    return __libc_realloc(old, size);
-}
-}
-#endif
 
 namespace {
 
