@@ -122,13 +122,14 @@ TEST_F(Tool, TellsWhatFieldsHold)
     MovieWriter movie(4000, 2000);
     movie.Raw(kTagDefineEditText, FieldBody(2, field)).Place2(1, {.character = 2, .name = "f"});
     Write("../m", (movie.Show(4).End(), movie.Bytes()));
-    Shell("printf '2 down 3 5\\n2 up 3 5\\n2 text x\\n2 key 15\\n2 key 4\\n2 key 3 shift' >../e");
+    Shell("printf '2 down 3 5\\n2 up 3 5\\n2 text x\xC3\xA9\xE2\x82\xAC\xE9\xC3\\n2 key 15\\n2 key "
+          "4\\n2 key 3 shift' >../e");
     ExpectInOrder(Run("state ../m --frame 2 --input ../e").out,
-                  {R"("/f")", R"("v" = "xone\x0dtw\xe9\x0dthree")",
-                   R"(text="xone\x0dtw\xe9\x0dthree" scroll=2/3 selection=8,5)"});
+                  {R"("/f")", R"("v" = "x\xe9?\xe9\xc3one\x0dtw\xe9\x0dthree")",
+                   R"(text="x\xe9?\xe9\xc3one\x0dtw\xe9\x0dthree" scroll=2/3 selection=12,9)"});
     ExpectInOrder(
         Run("state ../m --frame 2 --input ../e --json").out,
-        {R"("text":"xone\u000dtw\u00e9\u000dthree","scroll":2,"maxscroll":3,"selection":[8,5],)"});
+        {R"("text":"x\u00e9?\u00e9\u00c3one\u000dtw\u00e9\u000dthree","scroll":2,"maxscroll":3,"selection":[12,9],)"});
 }
 
 TEST_F(Tool, ListsAndTracesActions)

@@ -1,6 +1,7 @@
 #include "tools/vexel/input_events.h"
 
 #include "core/player/player.h"
+#include "platform/headless/host_text.h"
 #include "tools/vexel/arguments.h"
 #include "tools/vexel/message.h"
 
@@ -87,7 +88,7 @@ std::string EventLine::ParseText(InputEvent event)
 {
     if (rest.size() < 2)
         return "text needs characters";
-    for (const char c : rest.substr(1)) {
+    for (const char c : Latin1FromUtf8(rest.substr(1))) {
         event.key = static_cast<U8>(c);
         if (event.key < 32 || (event.key > 126 && event.key < 160))
             return Format("no key is the character %d", event.key);
