@@ -176,23 +176,35 @@ void EditText::NoteSelection()
         NoteLines(layout.LineOf(SelectionStart()), layout.LineOf(SelectionEnd()));
 }
 
-// Lines from top to bottom, with what outlines reach beyond them.
 SRECT EditText::TakeDirt()
 {
-    SRECT strip = record.bounds;
-    if (dirtyFrom > dirtyTo || RectIsEmpty(&strip))
-        RectSetEmpty(&strip);
-    else {
-        const S64 rise = std::max(font.Rise() - font.Ascent(), 0);
-        const S64 fall = std::max(S64(font.Fall()) + font.Ascent(), S64(layout.LineHeight()));
-        strip.ymin = S32(std::max(S64(strip.ymin), layout.LineTop(dirtyFrom) - rise));
-        if (dirtyTo != kNoLine)
-            strip.ymax = S32(std::min(S64(strip.ymax), layout.LineTop(dirtyTo) + fall));
-        if (strip.ymin > strip.ymax)
-            RectSetEmpty(&strip);
+    SRECT strip;
+    RectSetEmpty(&strip);
+    if (dirtyFrom <= dirtyTo)
+        strip = StripOf(dirtyFrom, dirtyTo);
+    if (!RectIsEmpty(&strip)) {
+        const U32 first = layout.FirstLine();
+        FreeLines(std::max(dirtyFrom, first) - first, dirtyTo - std::min(dirtyTo, first));
+        FreeSelection();
     }
     dirtyFrom = kNoLine;
     dirtyTo = 0;
+    return strip;
+}
+
+// Lines from top to bottom, with what outlines reach beyond them.
+SRECT EditText::StripOf(U32 from, U32 to) const
+{
+    SRECT strip = record.bounds;
+    if (RectIsEmpty(&strip))
+        return strip;
+    const S64 rise = std::max(font.Rise() - font.Ascent(), 0);
+    const S64 fall = std::max(S64(font.Fall()) + font.Ascent(), S64(layout.LineHeight()));
+    strip.ymin = S32(std::max(S64(strip.ymin), layout.LineTop(from) - rise));
+    if (to != kNoLine)
+        strip.ymax = S32(std::min(S64(strip.ymax), layout.LineTop(to) + fall));
+    if (strip.ymin > strip.ymax)
+        RectSetEmpty(&strip);
     return strip;
 }
 

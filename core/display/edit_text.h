@@ -89,9 +89,11 @@ public:
     void SetScroll(S32 scroll); // clamped
 
     // --- drawing ---
-    // What has changed since the last call lies there, in the field's own space; empty for nothing.
+    // Where what has changed since the last call lies, in the field's own space; empty for nothing
+    // in view. Its edges are built anew then.
     SRECT TakeDirt();
-    // Builds box, selection and the lines in view; glyphs go to the object's own edges.
+    // Builds what is missing of box, selection and the lines in view. The glyphs' colours are the
+    // object's.
     void Build(const STransform* placed);
     // Hands all to the raster, the text inside the field's bounds only.
     void Draw(CRaster* raster, RColor* clip);
@@ -115,6 +117,9 @@ private:
     void NoteLines(U32 from, U32 to);
     void NoteSelection();
     void NoteEdit();
+    SRECT StripOf(U32 from, U32 to) const;
+    void FreeLines(U32 from, U32 to);
+    void FreeSelection();
     void MoveCaret(ECaretMove move, bool extend);
     bool ScrollBy(ECaretMove move);
     void DeleteBy(ECaretMove move);
@@ -142,6 +147,10 @@ private:
     bool caretOn = true;        // blinks
     REdge* backEdges = nullptr; // border, background and selection
     RColor* backColors = nullptr;
+    GrowBuffer<REdge*> lineEdges; // glyphs of the lines in view; null: none, or to be built
+    REdge* caretEdges = nullptr;
+    RColor* glyphColors[2] = {}; // plain, selected; of the object's, null: not there yet
+    RColor* caretColor = nullptr;
     REdge* maskEdges = nullptr; // the bounds, which the text stays in
     RColor* maskColors = nullptr;
 };

@@ -31,7 +31,9 @@ public:
     void Paint();
 
 private:
-    bool InView(U32 line) const;
+    void PaintBounds();
+    U32 LinesInView() const;
+    void PaintLines();
     void PaintBox();
     void PaintBars();
     SRECT BarOf(U32 line) const;
@@ -50,7 +52,6 @@ private:
     const STransform* placed;
     U32 from; // of the selection
     U32 to;
-    RColor* glyphColors[2] = {}; // plain, selected
 };
 
 // The bounds come first: without them, in a list that is full of edges, nothing shows. A mask has
@@ -58,24 +59,48 @@ private:
 // shows no text.
 void FieldPainter::Paint()
 {
-    RColor* inside = CreateClipColor(display, &field.maskColors);
-    if (inside)
-        AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
+    if (!field.maskColors)
+        PaintBounds();
     if (obj->IsClip()) {
         GlyphColor(false);
     } else {
         PaintBox();
         PaintBars();
     }
-    for (U32 line = field.layout.FirstLine(); InView(line) && display->recordsLeft > 0; line++)
-        PaintLine(line);
+    PaintLines();
     if (field.caretOn && field.ShowsCaret())
         PaintCaret();
 }
 
-bool FieldPainter::InView(U32 line) const
+void FieldPainter::PaintBounds()
 {
-    return line < field.layout.LineCount() && field.layout.LineTop(line) < field.record.bounds.ymax;
+    RColor* inside = CreateClipColor(display, &field.maskColors);
+    if (inside)
+        AddRect(&field.record.bounds, &placed->mat, inside, display, &field.maskEdges, nullptr);
+}
+
+U32 FieldPainter::LinesInView() const
+{
+    const TextLayout& text = field.layout;
+    const S64 height = S64(field.record.bounds.ymax) - text.LineTop(text.FirstLine());
+    const S64 room = (std::max<S64>(height, 0) + text.LineHeight() - 1) / text.LineHeight();
+    return U32(std::min<S64>(room, text.LineCount() - text.FirstLine()));
+}
+
+// Lines that have their edges keep them. What the parser makes goes to the object first.
+void FieldPainter::PaintLines()
+{
+    const U32 count = LinesInView();
+    field.FreeLines(count, TextLayout::kLastLine);
+    if (!field.lineEdges.Resize(count))
+        return;
+    for (U32 i = 0; i < count && display->recordsLeft > 0; i++) {
+        if (field.lineEdges[i])
+            continue;
+        PaintLine(field.layout.FirstLine() + i);
+        field.lineEdges[i] = obj->edges;
+        obj->edges = nullptr;
+    }
 }
 
 void FieldPainter::PaintBox()
@@ -95,8 +120,9 @@ void FieldPainter::PaintBox()
 void FieldPainter::PaintBars()
 {
     RColor* bar = from < to ? BackColor(kBlack, kBar) : nullptr;
-    for (U32 line = field.layout.FirstLine(); bar && InView(line); line++) {
-        const SRECT r = BarOf(line);
+    const U32 first = field.layout.FirstLine(), count = bar ? LinesInView() : 0;
+    for (U32 i = 0; i < count; i++) {
+        const SRECT r = BarOf(first + i);
         if (r.xmin < r.xmax && r.ymin < r.ymax)
             AddRect(&r, &placed->mat, bar, display, &field.backEdges, nullptr);
     }
@@ -154,7 +180,7 @@ void FieldPainter::PaintGlyph(const LineWalk& at, S32 baseline)
 RColor* FieldPainter::GlyphColor(bool chosen)
 {
     chosen = chosen && !obj->IsClip();
-    RColor*& color = glyphColors[chosen];
+    RColor*& color = field.glyphColors[chosen];
     if (color)
         return color;
     color = obj->IsClip()
@@ -167,8 +193,9 @@ RColor* FieldPainter::GlyphColor(bool chosen)
 // As thin as can be, whatever the scale.
 void FieldPainter::PaintCaret()
 {
-    RColor* color =
-        CreateSolidColor(display, &obj->colors, field.record.color, placed->cxform, kCaret);
+    RColor*& color = field.caretColor;
+    if (!color)
+        color = CreateSolidColor(display, &obj->colors, field.record.color, placed->cxform, kCaret);
     if (!color)
         return;
     const U32 line = field.layout.LineOf(to);
@@ -177,9 +204,9 @@ void FieldPainter::PaintCaret()
     ends[1].x = ends[0].x;
     for (SPOINT& p : ends)
         MatrixTransformPoint(&placed->mat, &p, &p);
-    SStroker stroker(display, &obj->edges);
+    SStroker stroker(display, &field.caretEdges);
     stroker.BeginStroke(0, color);
-    AddRectEdge(&ends[0], &ends[1], nullptr, display, &obj->edges, &stroker);
+    AddRectEdge(&ends[0], &ends[1], nullptr, display, &field.caretEdges, &stroker);
     stroker.EndStroke();
 }
 
@@ -192,22 +219,47 @@ void EditText::Build(const STransform* placed)
 void EditText::Draw(CRaster* raster, RColor* clip)
 {
     raster->AddEdges(backEdges, backColors, clip);
-    raster->AddEdges(obj->edges, obj->colors, maskColors);
-    raster->AddEdges(maskEdges, maskColors, clip ? clip : ClipMarker());
+    DrawMask(raster, clip);
 }
 
 void EditText::DrawMask(CRaster* raster, RColor* clip)
 {
-    raster->AddEdges(obj->edges, obj->colors, maskColors);
+    for (REdge* line : lineEdges)
+        raster->AddEdges(line);
+    raster->AddEdges(caretEdges, obj->colors, maskColors);
     raster->AddEdges(maskEdges, maskColors, clip ? clip : ClipMarker());
 }
 
+// By their place in view.
+void EditText::FreeLines(U32 from, U32 to)
+{
+    DisplayList* display = obj->display;
+    for (size_t i = from; i <= to && i < lineEdges.size(); i++) {
+        display->FreeEdges(lineEdges[i]);
+        lineEdges[i] = nullptr;
+    }
+}
+
+// With box and caret.
+void EditText::FreeSelection()
+{
+    DisplayList* display = obj->display;
+    display->FreeEdges(backEdges);
+    display->FreeColors(backColors);
+    display->FreeEdges(caretEdges);
+    backEdges = caretEdges = nullptr;
+    backColors = nullptr;
+}
+
+// The colours of the glyphs go with the object's.
 void EditText::FreeCache()
 {
-    obj->display->FreeEdges(backEdges);
+    FreeLines(0, kNoLine);
+    FreeSelection();
+    lineEdges.Clear();
     obj->display->FreeEdges(maskEdges);
-    obj->display->FreeColors(backColors);
     obj->display->FreeColors(maskColors);
-    backEdges = maskEdges = nullptr;
-    backColors = maskColors = nullptr;
+    maskEdges = nullptr;
+    maskColors = nullptr;
+    glyphColors[0] = glyphColors[1] = caretColor = nullptr;
 }

@@ -78,7 +78,7 @@ void SObject::RecalculateText(const MATRIX* mat)
     if (RectIsEmpty(&changed))
         return;
     MatrixTransformRect(mat, &changed, &changed);
-    FreeCache();
+    Unbuild();
     display->InvalidateRect(&changed);
 }
 
@@ -209,11 +209,16 @@ void SObject::BuildShapeEdges(const STransform* placed)
         parser.BuildEdges(true, &devBounds);
 }
 
-void SObject::FreeCache()
+void SObject::Unbuild()
 {
     built = 0;
     for (SObject* p = parent; p && !p->unbuiltBelow; p = p->parent)
         p->unbuiltBelow = 1;
+}
+
+void SObject::FreeCache()
+{
+    Unbuild();
     display->FreeEdges(edges);
     edges = nullptr;
     display->FreeColors(colors);

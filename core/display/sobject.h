@@ -134,6 +134,7 @@ private:
     bool MayShowIn(const SRECT* area) const;
     void Recalculate(const MATRIX* mat);
     void RecalculateText(const MATRIX* mat);
+    void Unbuild();
     void InvalidateRemasked();
     void InvalidateDrawn();
     SObject* DrawInOrder(CRaster* raster, const STransform* parentXform, RColor* clip);
