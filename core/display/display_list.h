@@ -169,6 +169,8 @@ public:
     // Drops all cached edges and colours, and empty pool blocks.
     void FreeCache();
 
+    // Takes tags off the tick's budget.
+    void ChargeTags(U32 tags);
     // A text of so many bytes and lines has been handled: work, and tags.
     void ChargeText(U32 bytes, U32 lines = 0);
 
@@ -237,7 +239,6 @@ private:
     void ForgetIdentity();
     void QueueClick(const SObject* obj);
     void StartButtonSound(SObject* obj, int slot);
-    void ChargeTags(U32 tags);
     void BeginHitTest();
     void UnlinkThread(ScriptThread* thread);
     void DropActions(ScriptThread* thread);

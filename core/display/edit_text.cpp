@@ -13,6 +13,7 @@
 namespace {
 constexpr U32 kMostSpares = 16;
 constexpr U32 kSpareRoom = 4096;   // bytes of text
+constexpr U32 kNameCost = 256;     // bytes of text that a font's name is worth
 constexpr U32 kFontCost = 1 << 16; // bytes of text that measuring a font is worth
 
 // A name with a dot is that of no plain variable.
@@ -44,7 +45,8 @@ EditText* EditText::Create(SObject* obj)
     if (list.count >= gLimits.textFields)
         return nullptr;
     EditText* field = list.spare;
-    if (field) {
+    if (field &&
+        field->room <= gLimits.textFieldBytes - std::min(list.bytes, gLimits.textFieldBytes)) {
         list.spare = field->next;
         list.spares--;
     } else {
@@ -62,7 +64,6 @@ void EditText::Destroy(EditText* field)
     List& list = field->obj->display->fields;
     field->FreeCache();
     field->Unlink();
-    list.bytes -= field->room;
     if (list.spares >= kMostSpares || field->room > kSpareRoom) {
         delete field;
         return;
@@ -84,7 +85,7 @@ void EditText::List::FreeSpares()
 bool EditText::Prepare(SObject* object)
 {
     obj = object;
-    room = edits = anchor = caret = 0;
+    edits = anchor = caret = 0;
     goal = TextLayout::kNoGoal;
     selecting = false;
     caretOn = true;
@@ -92,6 +93,7 @@ bool EditText::Prepare(SObject* object)
     layout.Reset();
     record = SFieldRecord(obj->character);
     SPlayer* player = obj->display->splayer;
+    obj->display->ChargeText(U32(record.variable.size() + record.text.size()) + kNameCost);
     if (font.Resolve(record, obj->character->player, player ? &player->fontPlayer : nullptr))
         obj->display->ChargeText(kFontCost);
     layout.SetFormat(record, &font);
@@ -122,6 +124,7 @@ void EditText::Link()
     (previous ? previous->next : list.first) = this;
     list.last = this;
     list.count++;
+    list.bytes += room;
 }
 
 void EditText::Unlink()
@@ -130,15 +133,16 @@ void EditText::Unlink()
     (previous ? previous->next : list.first) = next;
     (next ? next->previous : list.last) = previous;
     list.count--;
+    list.bytes -= room;
 }
 
 // The greatest length that the limit for all fields leaves to this one. What counts is the room
-// that they keep, for lines take many times the memory of their bytes.
+// that they keep, as spares too, for lines take many times the memory of their bytes.
 U32 EditText::Allowed() const
 {
     const U32 others = obj->display->fields.bytes - room;
     const U32 left = gLimits.textFieldBytes - std::min(others, gLimits.textFieldBytes);
-    return std::min(left, TextLayout::kMaxText);
+    return std::min(std::max(left, room), TextLayout::kMaxText);
 }
 
 void EditText::TakeRoom()
@@ -225,7 +229,20 @@ ScriptThread* EditText::Bound(const char** name) const
     return thread && IsPlainName(*name) ? thread : nullptr;
 }
 
+// Long ways to variables are charged as tags, for frames place fields; without any left, nothing is
+// looked for.
 void EditText::UpdateFromVariable()
+{
+    constexpr U64 kWorkPerTag = 8;
+    DisplayList* display = obj->display;
+    if (display->tagsLeft == 0)
+        return;
+    const U64 before = display->work;
+    TakeVariable();
+    display->ChargeTags(U32((display->work - before) / kWorkPerTag));
+}
+
+void EditText::TakeVariable()
 {
     const char* name;
     ScriptThread* thread = Bound(&name);
@@ -233,7 +250,9 @@ void EditText::UpdateFromVariable()
         return;
     const SVariable* var = thread->FindVariable(name);
     if (var) {
-        SetText(Value(var->value));
+        const std::string_view value = Value(var->value);
+        obj->display->ChargeText(U32(value.size()));
+        SetText(value);
         return;
     }
     SetText(record.text);
@@ -297,7 +316,8 @@ void SObject::UpdateEditText(const ScriptThread* timeline, const char* varName, 
     const U32 hash = StrHash(varName);
     const std::string_view text = Value(value);
     const SPlayer* player = display->splayer;
-    for (EditText* f = display->fields.first; f; f = f->next) {
+    const U64 most = display->work + gLimits.workPerRun;
+    for (EditText* f = display->fields.first; f && display->work < most; f = f->next) {
         const bool typedInto = flag == 0 && player && player->focusText.Get() &&
                                player->focusText.Get()->editText == f;
         if (!typedInto && f->IsBoundTo(timeline, varName, hash))
@@ -310,7 +330,8 @@ bool SObject::ScrollEditText(const ScriptThread* timeline, const char* varName, 
 {
     const U32 hash = StrHash(varName);
     bool found = false;
-    for (EditText* f = display->fields.first; f; f = f->next) {
+    const U64 most = display->work + gLimits.workPerRun;
+    for (EditText* f = display->fields.first; f && display->work < most; f = f->next) {
         if (!f->IsBoundTo(timeline, varName, hash))
             continue;
         found = true;

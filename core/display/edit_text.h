@@ -109,6 +109,7 @@ private:
     EditText() = default;
     ~EditText() = default;
     bool Prepare(SObject* object);
+    void TakeVariable();
     bool TakePath();
     void Link();
     void Unlink();

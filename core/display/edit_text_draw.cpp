@@ -33,6 +33,11 @@ public:
 private:
     void PaintBounds();
     U32 LinesInView() const;
+    bool IsInView(U32 line) const
+    {
+        const U32 first = field.layout.FirstLine();
+        return line >= first && line - first < LinesInView();
+    }
     void PaintLines();
     void PaintBox();
     void PaintBars();
@@ -68,7 +73,7 @@ void FieldPainter::Paint()
         PaintBars();
     }
     PaintLines();
-    if (field.caretOn && field.ShowsCaret())
+    if (field.caretOn && field.ShowsCaret() && IsInView(field.layout.LineOf(to)))
         PaintCaret();
 }
 

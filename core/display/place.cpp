@@ -85,8 +85,12 @@ SObject* DisplayList::FindChild(SObject* parent, U16 depth)
 // Before anything is searched: loading the fonts places and removes an object.
 void DisplayList::PrepareField(const SCharacter* character)
 {
-    if (character->type == kCharEditText && splayer &&
-        FieldFont::WantsBuiltIn(SFieldRecord(character), character->player))
+    if (character->type != kCharEditText || !splayer ||
+        splayer->fontState != SPlayer::kFontsUntried)
+        return;
+    const SFieldRecord record(character);
+    ChargeText(U32(record.variable.size() + record.text.size()));
+    if (FieldFont::WantsBuiltIn(record, character->player))
         splayer->LoadBuiltInFonts();
 }
 

@@ -71,7 +71,8 @@ void SObject::Recalculate(const MATRIX* mat)
         editText->TakeDirt();
 }
 
-// A field whose text alone has changed.
+// A field whose text alone has changed. Where its lines do not run with the raster's rows, what a
+// row spills may leave the strip.
 void SObject::RecalculateText(const MATRIX* mat)
 {
     SRECT changed = editText->TakeDirt();
@@ -79,7 +80,8 @@ void SObject::RecalculateText(const MATRIX* mat)
         return;
     MatrixTransformRect(mat, &changed, &changed);
     Unbuild();
-    display->InvalidateRect(&changed);
+    const bool turned = mat->b != 0 || mat->c != 0;
+    display->InvalidateRect(turned ? &devBounds : &changed);
 }
 
 // A mask in the range that reaches beyond it is drawn itself, and what it masks shows inside it

@@ -115,6 +115,27 @@ TEST(Fields, PaintWhatReachesBeyondALine)
     }
 }
 
+// A caret that has been scrolled out of view is not seen in the margin, where nobody would erase
+// it.
+TEST(Fields, HideTheirCaretsWithTheirLines)
+{
+    MovieWriter movie = Begin();
+    movie.Raw(kTagDefineEditText, FieldBody(2, {.box = {0, 1000, 0, 900},
+                                                .flags = kUsual | kFieldMultiline,
+                                                .variable = "v",
+                                                .text = "a\ra\ra\ra"}));
+    Stage s(movie.Place(2, 1, Mat::Scale(4)));
+    s.MouseDown(150, 30), s.MouseUp(150, 30);
+    for (const int key : {97, 8}) {
+        s.Set("v.scroll", "2");
+        Shot(&s);
+        s.HandleKeyDown(key, 0);
+        const Picture part = Shot(&s);
+        s.scene.FreeCache(), s.scene.ModifyCamera();
+        EXPECT_EQ("", ExpectSame(part, Shot(&s), "caret-out"));
+    }
+}
+
 TEST(Fields, KeepToTheirLimits)
 {
     gLimits.textFieldBytes = 100, gLimits.textFields = 2;
