@@ -130,6 +130,8 @@ TEST_F(Tool, TellsWhatFieldsHold)
     ExpectInOrder(
         Run("state ../m --frame 2 --input ../e --json").out,
         {R"("text":"x\u00e9?\u00e9\u00c3one\u000dtw\u00e9\u000dthree","scroll":2,"maxscroll":3,"selection":[12,9],)"});
+    ExpectInOrder(Run("dump ../m").out, {R"(bounds=0,2000,0,560 flags=0x00a1 font=1 height=400 )"
+                                         R"(variable="v" text="one\x0dtw\xe9\x0dthree")"});
 }
 
 TEST_F(Tool, ListsAndTracesActions)

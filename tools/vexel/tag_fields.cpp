@@ -1,10 +1,14 @@
 #include "tools/vexel/tag_fields.h"
 
 #include "core/display/place_info.h"
+#include "core/stream/character.h"
 #include "core/stream/tags.h"
+#include "core/text/field_record.h"
 #include "tools/vexel/message.h"
 #include "tools/vexel/shape_scan.h"
 #include "tools/vexel/text_form.h"
+
+#include <algorithm>
 
 namespace {
 
@@ -110,6 +114,37 @@ std::string BoundsFields(TagReader& tag)
     return id + RectField(tag, "bounds");
 }
 
+std::string LayoutFields(const SFieldRecord& field)
+{
+    constexpr const char* kAlign[] = {"left", "right", "center", "justify"};
+    return Format(" align=%s margins=%d,%d indent=%d leading=%d", kAlign[field.align],
+                  field.leftMargin, field.rightMargin, field.indent, field.leading);
+}
+
+// What the flags announce, in their order.
+std::string EditTextFields(TagReader& tag)
+{
+    std::string text = BoundsFields(tag);
+    SCharacter character = {};
+    character.type = kCharEditText;
+    character.data = tag.script + tag.pos;
+    character.dataLen = std::max(tag.tagEnd - tag.pos, 0);
+    const SFieldRecord field(&character);
+    text += Format(" flags=0x%04x", field.flags);
+    if (field.Has(kFieldFont))
+        text += Format(" font=%u height=%d", field.fontId, field.height);
+    if (field.Has(kFieldColor))
+        text += " color=" + ColorText(field.color);
+    if (field.Has(kFieldMaxLen))
+        text += Format(" maxLen=%u", field.maxLen);
+    if (field.Has(kFieldLayout))
+        text += LayoutFields(field);
+    text += " variable=" + Quote(std::string(field.variable));
+    if (field.Has(kFieldText))
+        text += " text=" + Quote(std::string(field.text));
+    return text;
+}
+
 std::string LosslessFields(TagReader& tag)
 {
     std::string text = WordField(tag, "id");
@@ -202,8 +237,9 @@ std::string Decode(TagReader& tag)
         return LosslessFields(tag);
     case kTagDefineText:
     case kTagDefineText2:
-    case kTagDefineEditText:
         return BoundsFields(tag);
+    case kTagDefineEditText:
+        return EditTextFields(tag);
     case kTagDefineFont:
         return FontFields(tag);
     case kTagDefineFont2:
