@@ -204,7 +204,7 @@ void DisplayList::ChargeText(U32 bytes, U32 lines)
     ChargeTags(units / kUnitsPerTag);
 }
 
-// Allows a hit test its budgets. `pt` in device units, however far away it is.
+// Allows a hit test its budgets.
 void DisplayList::BeginHitTest()
 {
     recordsLeft = gLimits.shapeRecords;

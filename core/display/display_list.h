@@ -91,7 +91,7 @@ public:
     SButtonIdentity buttonIdentity = {};
     S32 instanceCount = 0;         // unnamed sprites placed so far
     CSoundMix* soundMix = nullptr; // takes all sounds; null: there are none
-    int editTextFlag = 0;          // some text field draws with a device font
+    int editTextFlag = 0;          // some text field draws with a device font; for shells
     EditText::List fields;         // the text fields of all objects
     SCharacter* pending = nullptr; // retained for a placement that waits for a removal
     U64 pixelsLeft = 0;            // of images that may be decoded for this repaint or hit test
@@ -195,6 +195,7 @@ public:
     // Queues a block of actions in a button's data, for the button's timeline.
     void QueueButtonBlock(const SObject* obj, const U8* block);
 
+    // Whole lists, or null, back into the pools.
     void FreeEdges(REdge* edges);
     void FreeColors(RColor* colors);
 

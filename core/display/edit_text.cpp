@@ -137,7 +137,8 @@ void EditText::Unlink()
 }
 
 // The greatest length that the limit for all fields leaves to this one. What counts is the room
-// that they keep, as spares too, for lines take many times the memory of their bytes.
+// that they keep, for lines take many times the memory of their bytes; spares, which are few and
+// small, count when they are used again.
 U32 EditText::Allowed() const
 {
     const U32 others = obj->display->fields.bytes - room;
@@ -191,7 +192,7 @@ SRECT EditText::TakeDirt()
         FreeLines(std::max(dirtyFrom, first) - first, dirtyTo - std::min(dirtyTo, first));
         FreeSelection();
     }
-    dirtyFrom = kNoLine;
+    dirtyFrom = kLastLine;
     dirtyTo = 0;
     return strip;
 }
@@ -205,7 +206,7 @@ SRECT EditText::StripOf(U32 from, U32 to) const
     const S64 rise = std::max(font.Rise() - font.Ascent(), 0);
     const S64 fall = std::max(S64(font.Fall()) + font.Ascent(), S64(layout.LineHeight()));
     strip.ymin = S32(std::max(S64(strip.ymin), layout.LineTop(from) - rise));
-    if (to != kNoLine)
+    if (to != kLastLine)
         strip.ymax = S32(std::min(S64(strip.ymax), layout.LineTop(to) + fall));
     if (strip.ymin > strip.ymax)
         RectSetEmpty(&strip);

@@ -35,6 +35,7 @@ public:
     // The field that `obj` shows, with its initial text. Null when memory or a limit forbids it;
     // the object then shows nothing.
     static EditText* Create(SObject* obj);
+    // With its edges and colours; the object that it is of lets go of it.
     static void Destroy(EditText* field);
     EditText(const EditText&) = delete;
     EditText& operator=(const EditText&) = delete;
@@ -42,7 +43,8 @@ public:
     const SFieldRecord& Record() const { return record; }
     const char* Text() const { return layout.Text(); }
     U32 Length() const { return layout.Length(); }
-    U32 Room() const { return room; } // the greatest length that it has had
+    // The greatest length that it has had, which counts for the limit.
+    U32 Room() const { return room; }
     // Replaces the text as scripts do, whatever the field's greatest length: selection and
     // scrolling stay as far as the new text allows.
     void SetText(std::string_view text);
@@ -59,12 +61,14 @@ public:
     // `pt` in twips of the field: a press, the moves after it, and with `down` off the release.
     void Mouse(const SPOINT& pt, bool down);
     bool Selecting() const { return selecting; } // between these two
-    // Scrolls the caret, which is at `to`, into view.
+    // Offsets beyond the text count as its end. Scrolls the caret, which is at `to`, into view.
     void Select(U32 from, U32 to);
+    // The same for a field in the place of one that was selected in, with the mouse down or not.
+    void Resume(U32 from, U32 to, bool mouseDown);
     // In place of what is selected, as much as the greatest length allows. Nothing where nothing
     // may be typed.
     void Insert(std::string_view s);
-    void DeleteSelection() { HasSelection() && MayType() ? ReplaceSelection("") : void(); }
+    void DeleteSelection(); // nothing either where nothing may be typed
     bool MayType() const { return !record.Has(kFieldReadOnly); }
     // How often keys, clipboard and mouse have changed the text.
     U32 Edits() const { return edits; }
@@ -124,11 +128,11 @@ private:
     void MoveCaret(ECaretMove move, bool extend);
     bool ScrollBy(ECaretMove move);
     void DeleteBy(ECaretMove move);
-    void ReplaceSelection(std::string_view s);
+    bool ReplaceSelection(std::string_view s);
     void SetSelection(U32 from, U32 to);
     void ShowCaret();
 
-    static constexpr U32 kNoLine = TextLayout::kLastLine;
+    static constexpr U32 kLastLine = TextLayout::kLastLine;
 
     SObject* obj = nullptr;
     EditText* previous = nullptr;
@@ -142,7 +146,7 @@ private:
     U32 caret = 0;
     S32 goal = TextLayout::kNoGoal; // of caret moves, see TextLayout::Move
     U32 edits = 0;
-    U32 dirtyFrom = kNoLine; // lines that have changed
+    U32 dirtyFrom = kLastLine; // lines that have changed
     U32 dirtyTo = 0;
     bool selecting = false;     // the mouse is down in it
     bool caretOn = true;        // blinks

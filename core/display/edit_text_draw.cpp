@@ -126,8 +126,9 @@ void FieldPainter::PaintBars()
 {
     RColor* bar = from < to ? BackColor(kBlack, kBar) : nullptr;
     const U32 first = field.layout.FirstLine(), count = bar ? LinesInView() : 0;
-    for (U32 i = 0; i < count; i++) {
+    for (U32 i = 0; i < count && display->recordsLeft > 0; i++) {
         const SRECT r = BarOf(first + i);
+        display->recordsLeft--;
         if (r.xmin < r.xmax && r.ymin < r.ymax)
             AddRect(&r, &placed->mat, bar, display, &field.backEdges, nullptr);
     }
@@ -259,7 +260,7 @@ void EditText::FreeSelection()
 // The colours of the glyphs go with the object's.
 void EditText::FreeCache()
 {
-    FreeLines(0, kNoLine);
+    FreeLines(0, kLastLine);
     FreeSelection();
     lineEdges.Clear();
     obj->display->FreeEdges(maskEdges);

@@ -105,10 +105,11 @@ void EditText::DeleteBy(ECaretMove move)
 {
     S32 none = TextLayout::kNoGoal;
     const U32 to = HasSelection() ? anchor : layout.Move(caret, move, &none);
-    if (MayType() && to != caret) {
-        anchor = to;
-        ReplaceSelection("");
-    }
+    if (!MayType() || to == caret)
+        return;
+    anchor = to;
+    if (!ReplaceSelection(""))
+        anchor = caret;
 }
 
 void EditText::Insert(std::string_view s)
@@ -122,15 +123,22 @@ void EditText::Insert(std::string_view s)
         ReplaceSelection(s);
 }
 
-void EditText::ReplaceSelection(std::string_view s)
+void EditText::DeleteSelection()
+{
+    if (HasSelection() && MayType())
+        ReplaceSelection("");
+}
+
+bool EditText::ReplaceSelection(std::string_view s)
 {
     const U32 at = SelectionStart();
     NoteSelection();
     if (!layout.Replace(at, SelectionEnd() - at, s))
-        return;
+        return false;
     NoteEdit();
     edits++;
     Select(at + U32(s.size()), at + U32(s.size()));
+    return true;
 }
 
 void EditText::Select(U32 from, U32 to)
@@ -139,10 +147,16 @@ void EditText::Select(U32 from, U32 to)
     ShowCaret();
 }
 
+void EditText::Resume(U32 from, U32 to, bool mouseDown)
+{
+    Select(from, to);
+    selecting = mouseDown;
+}
+
 void EditText::ShowCaret()
 {
     if (layout.Show(caret))
-        NoteLines(0, kNoLine);
+        NoteLines(0, kLastLine);
 }
 
 // While one end stays, what lies between the old other end and the new one changes.

@@ -2,10 +2,9 @@
 #include "core/display/display_list.h"
 #include "core/geom/curve.h"
 #include "core/stream/character.h"
+#include "core/text/field_record.h"
 
 namespace {
-constexpr U32 kFieldNotSelectable = 0x1000; // of the flags that a text field's record begins with
-
 // Units of work: an object and its transform, and how many edges are one.
 constexpr U64 kObjectWork = 4;
 constexpr U32 kEdgesPerUnit = 8;
@@ -87,7 +86,7 @@ bool SObject::TakeColorFlags()
 bool SObject::FieldContains(const MATRIX* placed, const SPOINT* pt) const
 {
     const U32 flags = character->DataLen() < 2 ? 0u : character->data[0] | character->data[1] << 8u;
-    if (flags & kFieldNotSelectable)
+    if (flags & kFieldNoSelect)
         return false;
     MATRIX toField;
     SPOINT inField;

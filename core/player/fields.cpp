@@ -29,15 +29,17 @@ S32 FrameForChange(ScriptThread* thread, const char* name)
 void CleanPasted(char* text, bool severalLines)
 {
     char* to = text;
+    char before = 0; // as it was: the text is changed in place
     for (const char* from = text; *from != 0; from++) {
-        const bool second = *from == '\n' && from > text && from[-1] == '\r';
-        const bool isBreak = *from == '\r' || *from == '\n';
+        const char c = *from;
+        const bool isBreak = c == '\r' || c == '\n';
         if (isBreak && !severalLines)
             break;
-        if (isBreak && !second)
+        if (isBreak && !(c == '\n' && before == '\r'))
             *to++ = '\r';
-        else if (!isBreak && static_cast<U8>(*from) >= 0x20)
-            *to++ = *from;
+        else if (!isBreak && static_cast<U8>(c) >= 0x20)
+            *to++ = c;
+        before = c;
     }
     *to = 0;
 }

@@ -44,13 +44,15 @@ SObject* SPlayer::PointAtText(SObject* hit, const SPOINT* pt, int mouseDown, boo
     if (overText != IsTextField(hit))
         UpdateCursor();
     if (IsTextField(hit) && mouseDown && !SelectsText() && !PressesButton()) {
+        const SPOINT dev = scene.ToDevice(*pt);
         SetFocusText(hit);
-        DragSelection(pt, 1);
+        hit->EditTextMouse(&dev, 1);
+        *changed = true;
     } else if (!IsTextField(hit) && mouseDown && focused != nullptr &&
                (!focused->editText || !focused->editText->Record().Has(kFieldKeepFocus))) {
         SetFocusText(nullptr);
     }
-    *changed = focused != focusText.Get();
+    *changed = *changed || focused != focusText.Get();
     return IsTextField(hit) ? nullptr : hit;
 }
 

@@ -128,6 +128,7 @@ public:
     virtual void ProcessFSCommand(const char* command, const char* args) = 0;
     // Brings menus up to date; after each control.
     virtual void EnableMenus(const MenuStatus& status) = 0;
+    // Shows the pointer as GetCursorType says; CursorTick calls it too.
     virtual void UpdateCursor() = 0;
     // Copies pixel rectangle `r` of the player's bits to the screen.
     virtual void BltToScreen(const SRECT* r) = 0;
@@ -225,14 +226,18 @@ public:
     int NumButtons() const;
     void AddButton(SObject* obj, const SRECT* bounds);
     void RemoveAllButtons();
-    // Gives the keyboard focus to a text field, or takes it from the one that has it. The field
-    // that had it loses its selection.
+    // Gives the keyboard focus to a text field, which takes it from a button too, or with null
+    // takes it from the field that has it. That one loses its selection.
     void SetFocusText(SObject* obj);
-    // In the text field that has it: 0 selects all, 1 deletes what is selected.
+    // In the text field that has it: 0 selects all, 1 deletes what is selected, others do nothing.
+    // Like a key it sets the bound variable when that differs, and calls the frame that hears of
+    // it.
     void EditCommand(int command);
     // What is selected there, freed with FreeStr; null when that is nothing or a password.
     void EditCopy(char** text);
-    // Puts a text, as bytes of Latin-1, in place of what is selected there.
+    // Puts a text, as bytes of Latin-1, in place of what is selected there, like a key. Breaks
+    // become carriage returns, or cut the text where there is one line; other codes below 32 are
+    // left out; what exceeds the field's greatest length is cut. Null does nothing.
     void EditPaste(const char* text);
     // Asks the shell for the pointer's shape anew and has the caret blink. A shell that never calls
     // it shows the caret all the time.

@@ -51,6 +51,7 @@ void SaveFocus::RememberText(const SObject* obj)
     anchor = obj->editText->Anchor();
     caret = obj->editText->Caret();
     scroll = obj->editText->Scroll();
+    selecting = obj->editText->Selecting();
 }
 
 void SaveFocus::RestoreText(SObject* obj)
@@ -58,7 +59,7 @@ void SaveFocus::RestoreText(SObject* obj)
     splayer->focusText.Set(obj);
     if (obj == nullptr || obj->editText == nullptr)
         return;
-    obj->editText->Select(anchor, caret);
+    obj->editText->Resume(anchor, caret, selecting);
     obj->editText->SetScroll(scroll);
 }
 

@@ -44,4 +44,5 @@ private:
     U32 anchor = 0; // of the text field's selection
     U32 caret = 0;
     S32 scroll = 1;
+    bool selecting = false; // the mouse is down in it
 };

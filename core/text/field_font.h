@@ -19,7 +19,8 @@ public:
     // Finds the font of a field. `movie` is the field's, `builtIn` the movie of the built-in fonts;
     // either may be null. A font of the movie is taken when the field asks for one and it is there;
     // else a built-in one by the name of the font that the field gives.
-    // True when the font was measured, which is done once for each font and takes a while.
+    // True when the font was measured, which takes a while and is done once for each font, and
+    // again when its information record comes later.
     bool Resolve(const SFieldRecord& field, ScriptPlayer* movie, ScriptPlayer* builtIn);
     // The field will need a built-in font.
     static bool WantsBuiltIn(const SFieldRecord& field, ScriptPlayer* movie);

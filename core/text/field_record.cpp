@@ -34,6 +34,7 @@ void SFieldReader::Read(SFieldRecord* r)
     r->variable = View(SFieldRecord::kMaxPath);
     if (r->variable.size() > size_t(SFieldRecord::kMaxPath)) {
         r->variable = {};
+        r->longPath = true;
         return;
     }
     if (r->Has(kFieldText))

@@ -47,6 +47,7 @@ struct SFieldRecord {
     S32 indent = 0;            // of a paragraph's first line, beside the margin
     S32 leading = 0;           // between lines, beside the font's; may be negative
     std::string_view variable; // path of the bound variable, not zero-terminated; empty: none
+    bool longPath = false;     // the path was too long to be one
     std::string_view text;     // initial text, not zero-terminated
 
     // A field that nothing describes.

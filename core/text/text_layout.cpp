@@ -140,7 +140,7 @@ void TextLayout::LayOut(U32 at, U32 removed, U32 added)
     U32 start = first < lines.size() ? lines[first].start : 0;
     bool opens = Opens(first);
     fresh.Clear();
-    for (whole = true; whole && start != kNoLine;) {
+    for (whole = true; whole && start != kNoOffset;) {
         STextLine line;
         start = LayOutLine(start, opens, &line);
         opens = line.hard;
@@ -191,7 +191,7 @@ void TextLayout::Splice(U32 first, U32 keep, U32 delta)
     }
 }
 
-// Fills in the line that begins at `start` and gives the start of the next, kNoLine when the text
+// Fills in the line that begins at `start` and gives the start of the next, kNoOffset when the text
 // ends. A space that does not fit hangs; any other byte that does not fit ends the line behind the
 // last space or hyphen, or else before itself. Stars have no such places: how long the words of a
 // password are is nobody's business.
@@ -228,7 +228,7 @@ U32 TextLayout::LayOutLine(U32 start, bool opens, STextLine* line) const
     }
     const bool hangs = x > room && place == i && i > start && Byte(i - 1) == ' ';
     finish(i, hangs ? widthBefore : x);
-    return i < len ? EndAtBreak(i, line) : kNoLine;
+    return i < len ? EndAtBreak(i, line) : kNoOffset;
 }
 
 // The line ends with the break at `at`, and saw what follows a carriage return.

@@ -105,7 +105,7 @@ public:
 
 private:
     friend class LineWalk;
-    static constexpr U32 kNoLine = 0xFFFFFFFF;
+    static constexpr U32 kNoOffset = 0xFFFFFFFF;
     static constexpr size_t kKeptFresh = 1024; // lines; room for more is given back
 
     bool SeveralLines() const { return flags & kFieldMultiline; }

@@ -139,7 +139,8 @@ std::string EditTextFields(TagReader& tag)
         text += Format(" maxLen=%u", field.maxLen);
     if (field.Has(kFieldLayout))
         text += LayoutFields(field);
-    text += " variable=" + Quote(std::string(field.variable));
+    text +=
+        field.longPath ? " variable=(too long)" : " variable=" + Quote(std::string(field.variable));
     if (field.Has(kFieldText))
         text += " text=" + Quote(std::string(field.text));
     return text;
