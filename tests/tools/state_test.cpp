@@ -134,6 +134,15 @@ TEST_F(Tool, TellsWhatFieldsHold)
                                          R"(variable="v" text="one\x0dtw\xe9\x0dthree")"});
 }
 
+TEST_F(Tool, SignsTheBookByAFile)
+{
+    const std::string form = VEXEL_SOURCE_DIR "/samples/form.";
+    ExpectInOrder(Run("state " + form + "vxm --frame 14 --input " + form + "txt").out,
+                  {"frame=2/2 stopped", "edit id=39 text=\"Ada Lovelace\"", "post \"file://",
+                   "/samples/guestbook\" window=\"/desk\" data=\"name=Ada+Lovelace&guests=12&"
+                   "password=s3cret&message=Clouds+until+ten%2E+Then%0DSaturn%2C+wide+open%2E\""});
+}
+
 TEST_F(Tool, ListsAndTracesActions)
 {
     Write("../m", PadMovie());
