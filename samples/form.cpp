@@ -40,9 +40,9 @@ static void DefineWords(TagWriter& movie, const Font& font, const Font& head)
     DefineText(movie, kThanks, head, {{"Thank you,", kMiddle, 182, 19, kInk, 0.5, 0.4}});
 }
 
-static void DefineFields(TagWriter& movie)
+// To be filled in.
+static void DefineInputs(TagWriter& movie)
 {
-    constexpr U32 kShown = kFieldReadOnly | kFieldNoSelect;
     DefineField(movie, kNameField,
                 {.width = kInnerRight - kInnerLeft - 62,
                  .height = 20,
@@ -74,6 +74,12 @@ static void DefineFields(TagWriter& movie)
                  .mostLetters = kMostLetters,
                  .leading = 1,
                  .variable = "/entry:message"});
+}
+
+// To be read.
+static void DefineOutputs(TagWriter& movie)
+{
+    constexpr U32 kShown = kFieldReadOnly | kFieldNoSelect;
     DefineField(movie, kCountField,
                 {.width = 130,
                  .height = 17,
@@ -230,7 +236,8 @@ std::vector<U8> MakeForm()
     DefineNight(movie);
     DefinePage(movie);
     DefineWords(movie, font, head);
-    DefineFields(movie);
+    DefineInputs(movie);
+    DefineOutputs(movie);
     DefineButtons(movie, font);
     DefineTables(movie);
 
