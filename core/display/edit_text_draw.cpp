@@ -4,7 +4,6 @@
 #include <algorithm>
 
 #include "core/display/display_list.h"
-#include "core/player/limits.h"
 #include "core/player/player.h"
 #include "core/shape/character_parser.h"
 #include "core/shape/stroker.h"

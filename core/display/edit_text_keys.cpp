@@ -3,7 +3,6 @@
 
 #include "core/display/display_list.h"
 #include "core/display/edit_text.h"
-#include "core/player/limits.h"
 #include "core/player/player.h"
 
 namespace {
